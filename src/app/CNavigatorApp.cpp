@@ -1,0 +1,93 @@
+#include "app/CNavigatorApp.h"
+
+#include "app/IdlePass.h"
+#include "libs/toolwell/IHarborUtils.h"
+#include "ui/QtMessageBox.h"
+#include "ui/QtWaitCursor.h"
+#include "ui/TerminationSignals.h"
+
+#include <QApplication>
+
+namespace {
+
+constexpr int kDefaultWidth = 280;
+constexpr int kDefaultHeight = 650;
+
+QtMessageBox g_messageBox;
+QtWaitCursor g_waitCursor;
+
+} // namespace
+
+CNavigatorApp::CNavigatorApp() = default;
+
+CNavigatorApp::~CNavigatorApp() {
+    Platform::SetMessageBox(nullptr);
+    Platform::SetWaitCursor(nullptr);
+}
+
+int CNavigatorApp::Run() {
+    if (!InitInstance()) {
+        delete m_mainWindow.data();
+        return ExitInstance();
+    }
+    QApplication::setQuitOnLastWindowClosed(false); // the idle pass ends the loop
+    m_idlePass = std::make_unique<IdlePass>([this](int count) { return OnIdle(count); });
+    m_idlePass->Start();
+    m_exitCode = QApplication::exec();
+    m_idlePass.reset();
+    return ExitInstance();
+}
+
+bool CNavigatorApp::InitInstance() {
+    Platform::SetMessageBox(&g_messageBox);
+    Platform::SetWaitCursor(&g_waitCursor);
+
+    m_applicationInfo.reset(CreateApplicationInfo());
+    if (!m_applicationInfo)
+        return false;
+
+    IHarborUtils* utils = GetHarborUtilsInterface();
+    if (utils == nullptr || !utils->IsReady() || !utils->IsEnabled())
+        return false;
+    utils->SetShuttingDown(false);
+
+    m_dataStoreHost.reset(GetDataStoreHost());
+    if (!m_dataStoreHost)
+        return false;
+
+    m_mainWindow = new QMainWindow;
+    m_mainWindow->setAttribute(Qt::WA_DeleteOnClose);
+    m_mainWindow->setWindowTitle(QStringLiteral("Quillmark Ambrel"));
+    PlaceMainWindow();
+    m_mainWindow->show();
+
+    m_terminationSignals = std::make_unique<TerminationSignals>();
+    connect(m_terminationSignals.get(), &TerminationSignals::Received, this, [this] {
+        // Closing the window as a user would lets the usual shut-down run.
+        if (m_mainWindow)
+            m_mainWindow->close();
+        else
+            QCoreApplication::exit(0);
+    });
+    return true;
+}
+
+void CNavigatorApp::PlaceMainWindow() {
+    m_mainWindow->setGeometry(0, 0, kDefaultWidth, kDefaultHeight);
+}
+
+bool CNavigatorApp::OnIdle(int count) {
+    if (!m_mainWindow) {
+        QCoreApplication::exit(0);
+        return false;
+    }
+    return count < 1;
+}
+
+int CNavigatorApp::ExitInstance() {
+    m_terminationSignals.reset();
+    m_dataStoreHost.reset();
+    ReleaseHarborUtilsInterface();
+    m_applicationInfo.reset();
+    return m_exitCode;
+}

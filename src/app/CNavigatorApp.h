@@ -1,0 +1,44 @@
+#pragma once
+
+#include "app/ApplicationInfo.h"
+#include "common/ReleasePtr.h"
+#include "libs/toolwell/IDataStoreHost.h"
+
+#include <QMainWindow>
+#include <QObject>
+#include <QPointer>
+
+#include <memory>
+
+class IdlePass;
+class TerminationSignals;
+
+// The application object: start-up, the idle pass and shut-down of the navigator.
+class CNavigatorApp final : public QObject {
+    Q_OBJECT
+public:
+    CNavigatorApp();
+    ~CNavigatorApp() override;
+
+    // Starts up, runs the event loop and shuts down; answers the process exit code.
+    int Run();
+
+    bool InitInstance();
+    bool OnIdle(int count);
+    int ExitInstance();
+
+    QMainWindow* MainWindow() const { return m_mainWindow; }
+    Brindle::Application::IApplicationInfo* ApplicationInfoObject() const {
+        return m_applicationInfo.get();
+    }
+
+private:
+    void PlaceMainWindow();
+
+    ReleasePtr<Brindle::Application::IApplicationInfo> m_applicationInfo;
+    ReleasePtr<IDataStoreHost> m_dataStoreHost;
+    QPointer<QMainWindow> m_mainWindow;
+    std::unique_ptr<IdlePass> m_idlePass;
+    std::unique_ptr<TerminationSignals> m_terminationSignals;
+    int m_exitCode = 0;
+};

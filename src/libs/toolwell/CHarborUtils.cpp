@@ -1,0 +1,31 @@
+#include "libs/toolwell/CHarborUtils.h"
+
+#include <memory>
+
+namespace {
+
+std::unique_ptr<CHarborUtils> g_instance;
+IHarborUtils* g_testInstance = nullptr;
+
+} // namespace
+
+int CHarborUtils::IsFeatureAvailable(int) { return 0; }
+
+void CHarborUtils::GetMessageCenterSize(int* width, int* height) {
+    if (width != nullptr)
+        *width = 0;
+    if (height != nullptr)
+        *height = 0;
+}
+
+IHarborUtils* GetHarborUtilsInterface() {
+    if (g_testInstance != nullptr)
+        return g_testInstance;
+    if (!g_instance)
+        g_instance = std::make_unique<CHarborUtils>();
+    return g_instance.get();
+}
+
+void ReleaseHarborUtilsInterface() { g_instance.reset(); }
+
+void SetHarborUtilsForTesting(IHarborUtils* utils) { g_testInstance = utils; }

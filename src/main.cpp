@@ -1,0 +1,11 @@
+#include "app/CNavigatorApp.h"
+
+#include <QApplication>
+
+int main(int argc, char* argv[]) {
+    QApplication application(argc, argv);
+    QApplication::setApplicationName(QStringLiteral("Quillmark Ambrel"));
+    QApplication::setOrganizationName(QStringLiteral("Brindle"));
+    CNavigatorApp navigator;
+    return navigator.Run();
+}
