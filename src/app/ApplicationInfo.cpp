@@ -6,7 +6,9 @@
 
 ApplicationInfo::ApplicationInfo(const QString& programFolder) : m_programFolder(programFolder) {}
 
-unsigned long ApplicationInfo::AddRef() { return ++m_references; }
+unsigned long ApplicationInfo::AddRef() {
+    return ++m_references;
+}
 
 unsigned long ApplicationInfo::Release() {
     if (--m_references == 0)
@@ -32,8 +34,10 @@ HRESULT ApplicationInfo::GetLanguageFolder(IUnicodeString* sink) {
     UnicodeStringPtr programSink(&programFolder);
     if (const HRESULT hr = GetProgramFolder(&programSink); FAILED(hr))
         return hr;
-    const QString folder = QDir::cleanPath(QDir(programFolder).absoluteFilePath(
-        QStringLiteral("../Languages/") + m_language + QStringLiteral("/Programs")));
+    const QString folder =
+        QDir::cleanPath(QDir(programFolder)
+                            .absoluteFilePath(QStringLiteral("../Languages/") + m_language +
+                                              QStringLiteral("/Programs")));
     return sink->Assign(folder + u'/');
 }
 

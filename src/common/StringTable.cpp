@@ -84,7 +84,9 @@ const QHash<int, QString>& Table() {
 
 } // namespace
 
-QString LoadString(int id) { return Table().value(id); }
+QString LoadString(int id) {
+    return Table().value(id);
+}
 
 QString FormatString(int id, const QString& argument) {
     QString text = LoadString(id);

@@ -23,6 +23,8 @@ IMessageBox& MessageBox() {
     return g_messageBox != nullptr ? *g_messageBox : fallback;
 }
 
-void SetMessageBox(IMessageBox* messageBox) { g_messageBox = messageBox; }
+void SetMessageBox(IMessageBox* messageBox) {
+    g_messageBox = messageBox;
+}
 
 } // namespace Platform

@@ -26,6 +26,8 @@ IProcessLauncher& ProcessLauncher() {
     return g_launcher != nullptr ? *g_launcher : real;
 }
 
-void SetProcessLauncher(IProcessLauncher* launcher) { g_launcher = launcher; }
+void SetProcessLauncher(IProcessLauncher* launcher) {
+    g_launcher = launcher;
+}
 
 } // namespace Platform

@@ -39,7 +39,9 @@ QString Registry::MachineFile() {
                                    : g_machineFile;
 }
 
-void Registry::SetMachineFile(const QString& path) { g_machineFile = path; }
+void Registry::SetMachineFile(const QString& path) {
+    g_machineFile = path;
+}
 
 QVariant Registry::UserValue(const QString& keyPath, const QString& name) {
     const QSettings settings(UserFile(), QSettings::IniFormat);

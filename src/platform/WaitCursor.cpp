@@ -19,6 +19,8 @@ IWaitCursor& WaitCursor() {
     return g_cursor != nullptr ? *g_cursor : none;
 }
 
-void SetWaitCursor(IWaitCursor* cursor) { g_cursor = cursor; }
+void SetWaitCursor(IWaitCursor* cursor) {
+    g_cursor = cursor;
+}
 
 } // namespace Platform

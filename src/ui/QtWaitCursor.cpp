@@ -3,6 +3,10 @@
 #include <QCursor>
 #include <QGuiApplication>
 
-void QtWaitCursor::Begin() { QGuiApplication::setOverrideCursor(QCursor(Qt::WaitCursor)); }
+void QtWaitCursor::Begin() {
+    QGuiApplication::setOverrideCursor(QCursor(Qt::WaitCursor));
+}
 
-void QtWaitCursor::End() { QGuiApplication::restoreOverrideCursor(); }
+void QtWaitCursor::End() {
+    QGuiApplication::restoreOverrideCursor();
+}

@@ -13,11 +13,13 @@ const QString kStartPanelKey =
     QStringLiteral("SOFTWARE\\Brindle\\Quillmark Ambrel\\Start Panel\\1.0\\Settings\\");
 
 TEST_F(RegistryTest, UserValuesAreWrittenReadAndRemovedUnderTheConfigFolder) {
-    EXPECT_FALSE(Registry::UserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")).isValid());
+    EXPECT_FALSE(
+        Registry::UserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")).isValid());
     EXPECT_FALSE(Registry::HasUserKey(kStartPanelKey));
 
     ASSERT_TRUE(Registry::SetUserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart"), 1));
-    EXPECT_EQ(Registry::UserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")).toInt(), 1);
+    EXPECT_EQ(Registry::UserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")).toInt(),
+              1);
     EXPECT_TRUE(Registry::HasUserKey(kStartPanelKey));
     // The same key written without its trailing separator or in the other slash form is the
     // same key.

@@ -33,12 +33,22 @@ void AmbrelTest::SetUp() {
     Platform::Registry::SetMachineFile(Home() + QStringLiteral("/etc/Quillmark Ambrel.ini"));
 }
 
-void AmbrelTest::TearDown() { ResetSingletons(); }
+void AmbrelTest::TearDown() {
+    ResetSingletons();
+}
 
-QString AmbrelTest::Home() const { return m_home->path(); }
-QString AmbrelTest::DataHome() const { return Home() + QStringLiteral("/data"); }
-QString AmbrelTest::ConfigHome() const { return Home() + QStringLiteral("/config"); }
-QString AmbrelTest::RuntimeHome() const { return Home() + QStringLiteral("/runtime"); }
+QString AmbrelTest::Home() const {
+    return m_home->path();
+}
+QString AmbrelTest::DataHome() const {
+    return Home() + QStringLiteral("/data");
+}
+QString AmbrelTest::ConfigHome() const {
+    return Home() + QStringLiteral("/config");
+}
+QString AmbrelTest::RuntimeHome() const {
+    return Home() + QStringLiteral("/runtime");
+}
 
 QString AmbrelTest::AppDataFolder() const {
     return DataHome() + QStringLiteral("/Brindle/Quillmark Ambrel");

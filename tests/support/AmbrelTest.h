@@ -6,6 +6,12 @@
 #include <QTemporaryDir>
 
 #include <memory>
+#include <ostream>
+
+// Test failures show strings as text.
+inline void PrintTo(const QString& text, std::ostream* out) {
+    *out << '"' << text.toStdString() << '"';
+}
 
 // The fixture every test stands on: a fresh temporary home for the program's data, settings
 // and runtime folders, and every process-wide singleton back in its first state.

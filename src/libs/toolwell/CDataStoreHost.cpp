@@ -9,7 +9,9 @@
 CDataStoreHost::CDataStoreHost(const QString& applicationDataFolder)
     : m_storeFolder(applicationDataFolder + QStringLiteral("/Catalog")) {}
 
-unsigned long CDataStoreHost::AddRef() { return ++m_references; }
+unsigned long CDataStoreHost::AddRef() {
+    return ++m_references;
+}
 
 unsigned long CDataStoreHost::Release() {
     const unsigned long left = --m_references;

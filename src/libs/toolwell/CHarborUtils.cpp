@@ -9,7 +9,9 @@ IHarborUtils* g_testInstance = nullptr;
 
 } // namespace
 
-int CHarborUtils::IsFeatureAvailable(int) { return 0; }
+int CHarborUtils::IsFeatureAvailable(int) {
+    return 0;
+}
 
 void CHarborUtils::GetMessageCenterSize(int* width, int* height) {
     if (width != nullptr)
@@ -26,6 +28,11 @@ IHarborUtils* GetHarborUtilsInterface() {
     return g_instance.get();
 }
 
-void ReleaseHarborUtilsInterface() { g_instance.reset(); }
+void ReleaseHarborUtilsInterface() {
+    g_instance.reset();
+    g_testInstance = nullptr;
+}
 
-void SetHarborUtilsForTesting(IHarborUtils* utils) { g_testInstance = utils; }
+void SetHarborUtilsForTesting(IHarborUtils* utils) {
+    g_testInstance = utils;
+}

@@ -30,5 +30,6 @@ private:
     QRect m_navigatorRect;
 };
 
-// Lets a test put its own utility engine in place of the real one (null restores it).
+// Lets a test put its own utility engine in place of the real one until it is released
+// (null restores the real one).
 void SetHarborUtilsForTesting(IHarborUtils* utils);

@@ -7,7 +7,8 @@
 HRESULT FormatTime(QString* text, std::int64_t time) {
     if (text == nullptr)
         return E_INVALIDARG;
-    *text = QDateTime::fromSecsSinceEpoch(time, QTimeZone::utc()).toString(Qt::ISODate);
+    *text = QDateTime::fromSecsSinceEpoch(time, QTimeZone::utc())
+                .toString(QStringLiteral("yyyy-MM-dd'T'HH:mm:ss'Z'"));
     return text->isEmpty() ? E_FAIL : S_OK;
 }
 

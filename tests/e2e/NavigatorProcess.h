@@ -1,0 +1,26 @@
+#pragma once
+
+#include <QProcess>
+#include <QString>
+#include <QStringList>
+
+// The built navigator program, run offscreen with its data, settings and runtime folders in a
+// test's temporary home.
+class NavigatorProcess {
+public:
+    explicit NavigatorProcess(const QString& home);
+    ~NavigatorProcess();
+
+    void Start(const QStringList& arguments = {});
+    // Waits until the program has started up and is running its event loop.
+    bool WaitUntilRunning(int timeoutMs = 15000);
+    // Sends SIGTERM; answers whether the program then ended by itself within the time.
+    bool Terminate(int timeoutMs = 10000);
+
+    QProcess& Process() { return m_process; }
+    QProcessEnvironment Environment() const;
+
+private:
+    QString m_home;
+    QProcess m_process;
+};
