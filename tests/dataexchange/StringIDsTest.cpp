@@ -1,0 +1,46 @@
+#include "common/ReleasePtr.h"
+#include "dataexchange/CBasicStringIDReporter.h"
+#include "dataexchange/CRecursiveChildrenReporter.h"
+#include "dataexchange/WStringIDs.h"
+#include "support/AmbrelTest.h"
+
+using namespace DataExchange;
+
+namespace {
+
+class StringIDsTest : public AmbrelTest {};
+
+class AnsweringReporter final : public IStringIDReporter {
+public:
+    HRESULT ReportStringID(const QString&) override { return ++calls; }
+    int calls = 0;
+};
+
+} // namespace
+
+TEST_F(StringIDsTest, ReportsInInsertionOrderKeepingDuplicates) {
+    ReleasePtr<IStringIDs> list(CreateStringIDs());
+    CBasicStringIDReporter collected;
+    EXPECT_EQ(list->ReportStringIDs(&collected), S_FALSE);
+    EXPECT_TRUE(collected.StringIDs().isEmpty());
+
+    for (const char* id : {"b", "a", "b", ""})
+        EXPECT_EQ(list->AddStringID(QString::fromLatin1(id)), S_OK);
+    EXPECT_EQ(list->AddStringID(QString()), E_INVALIDARG);
+
+    EXPECT_EQ(list->ReportStringIDs(&collected), S_OK);
+    EXPECT_EQ(collected.StringIDs(),
+              (QStringList{QStringLiteral("b"), QStringLiteral("a"), QStringLiteral("b"), {}}));
+
+    AnsweringReporter answering;
+    EXPECT_EQ(list->ReportStringIDs(&answering), 4) << "the last call's answer";
+}
+
+TEST_F(StringIDsTest, RecursiveChildrenReporterNeverSkips) {
+    CRecursiveChildrenReporter reporter;
+    IDataStoreReporter& walk = reporter;
+    EXPECT_EQ(walk.ReportItem(QStringLiteral("A")), S_OK);
+    EXPECT_EQ(walk.SkipChildren(), 0);
+    EXPECT_EQ(walk.ReportItem(QStringLiteral("B")), S_OK);
+    EXPECT_EQ(reporter.Items(), (QStringList{QStringLiteral("A"), QStringLiteral("B")}));
+}
