@@ -5,6 +5,12 @@
 #include "platform/IProcessLauncher.h"
 #include "platform/IWaitCursor.h"
 #include "platform/Registry.h"
+#ifdef AMBREL_WITH_CATALOG
+#include "catalog/IDataStoreService.h"
+#endif
+#ifdef AMBREL_WITH_SETTINGS
+#include "settings/NavigatorSettings.h"
+#endif
 
 #include <QDir>
 #include <QFile>
@@ -17,6 +23,13 @@ void ResetSingletons() {
     Platform::SetWaitCursor(nullptr);
     Platform::SetProcessLauncher(nullptr);
     Platform::Registry::SetMachineFile({});
+#ifdef AMBREL_WITH_CATALOG
+    if (IDataStoreService* service = GetDataStoreService())
+        service->Shutdown(0);
+#endif
+#ifdef AMBREL_WITH_SETTINGS
+    NavigatorSettings::DestroyInstance();
+#endif
 }
 
 void AmbrelTest::SetUp() {

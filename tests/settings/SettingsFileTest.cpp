@@ -1,0 +1,215 @@
+#include "settings/NavigatorSettings.h"
+#include "support/AmbrelTest.h"
+
+#include <QDir>
+#include <QFile>
+
+namespace {
+
+// The text of a file the program writes with every option at its default, keys in code-unit
+// order.
+const char16_t* const kDefaultText =
+    u"applicationposition|0,0,0,0|cleandeletedonclose|false|"
+    u"defaultbackgroundcolor|255,255,255|defaultbackgroundimage||defaultfont|Times New Roman|"
+    u"defaultfontsize|12|keepontop|false|lastselecteditemid||launchapponstart|false|"
+    u"maxlinkeddocuments|100|showalltypes|true|showdoc|false|showframe|true|"
+    u"showmessagecentre|true|shownotes|false|showopeneditemsonly|false|showpdf|false|"
+    u"showqmd|false|";
+
+// UTF-16 little-endian, written out unit by unit: low byte, then high byte.
+QByteArray Utf16Le(const char16_t* text) {
+    QByteArray bytes;
+    for (const char16_t* unit = text; *unit != 0; ++unit) {
+        bytes.append(static_cast<char>(*unit & 0xFF));
+        bytes.append(static_cast<char>(*unit >> 8));
+    }
+    return bytes;
+}
+
+class SettingsFileTest : public AmbrelTest {
+protected:
+    QString FilePath() const { return AppDataFolder() + QStringLiteral("/NavSettings.dat"); }
+
+    void WriteSettings(const QByteArray& bytes) const {
+        WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/NavSettings.dat"), bytes);
+    }
+
+    QByteArray FileBytes() const {
+        QFile file(FilePath());
+        EXPECT_TRUE(file.open(QIODevice::ReadOnly)) << "no settings file";
+        return file.readAll();
+    }
+
+    static NavigatorSettings* Settings() { return NavigatorSettings::Instance(); }
+
+    static void ExpectDefaults() {
+        NavigatorSettings* s = Settings();
+        EXPECT_EQ(s->GetApplicationPosition(), WindowRect{});
+        EXPECT_EQ(s->GetMaxLinkedDocuments(), 100);
+        EXPECT_FALSE(s->GetCleanDeletedOnClose());
+        EXPECT_FALSE(s->GetLaunchAppOnStart());
+        EXPECT_FALSE(s->GetShowNotes());
+        EXPECT_FALSE(s->GetShowQmd());
+        EXPECT_FALSE(s->GetShowDoc());
+        EXPECT_FALSE(s->GetShowPdf());
+        EXPECT_TRUE(s->GetShowAllTypes());
+        EXPECT_FALSE(s->GetShowOpenedItemsOnly());
+        EXPECT_EQ(s->GetLastSelectedItemId(), QString());
+        EXPECT_EQ(s->GetDefaultFontSize(), 12);
+        EXPECT_EQ(s->GetDefaultFont(), QStringLiteral("Times New Roman"));
+        EXPECT_EQ(s->GetDefaultBackgroundColor(), QStringLiteral("255,255,255"));
+        EXPECT_EQ(s->GetDefaultBackgroundImage(), QString());
+        EXPECT_FALSE(s->GetKeepOnTop());
+        EXPECT_TRUE(s->GetShowFrame());
+        EXPECT_FALSE(s->IsDirty());
+    }
+
+    // Loads a file holding only "applicationposition" with the given value.
+    WindowRect PositionAfterLoading(const char16_t* value) {
+        WriteSettings(Utf16Le(u"applicationposition|") + Utf16Le(value) + Utf16Le(u"|"));
+        EXPECT_TRUE(Settings()->Load());
+        return Settings()->GetApplicationPosition();
+    }
+};
+
+} // namespace
+
+TEST_F(SettingsFileTest, DefaultsAreWrittenByteForByte) {
+    EXPECT_FALSE(Settings()->Load()) << "no file yet";
+    ExpectDefaults();
+
+    ASSERT_TRUE(Settings()->Save());
+    const QByteArray bytes = FileBytes();
+    EXPECT_EQ(bytes, Utf16Le(kDefaultText));
+    EXPECT_EQ(bytes.left(6), QByteArray("a\0p\0p\0", 6)) << "no byte-order mark";
+    EXPECT_EQ(bytes.right(2), QByteArray("|\0", 2)) << "no terminator";
+}
+
+TEST_F(SettingsFileTest, LoadThenSaveKeepsEveryValueAndByte) {
+    const char16_t* const text =
+        u"applicationposition|-20,30,400,700|cleandeletedonclose|true|"
+        u"defaultbackgroundcolor|0,128,255|defaultbackgroundimage|/pics/a\\|b\\\\c.png|"
+        u"defaultfont|Noto \\\\ Sans|defaultfontsize|18|keepontop|true|"
+        u"lastselecteditemid|0F8FAD5B-D9CB-469F-A165-70867728950E|launchapponstart|true|"
+        u"maxlinkeddocuments|7|showalltypes|false|showdoc|false|showframe|false|"
+        u"showmessagecentre|false|shownotes|false|showopeneditemsonly|true|showpdf|true|"
+        u"showqmd|false|";
+    WriteSettings(Utf16Le(text));
+    ASSERT_TRUE(Settings()->Load());
+
+    NavigatorSettings* s = Settings();
+    EXPECT_EQ(s->GetApplicationPosition(), (WindowRect{-20, 30, 380, 730}));
+    EXPECT_TRUE(s->GetCleanDeletedOnClose());
+    EXPECT_EQ(s->GetDefaultBackgroundColor(), QStringLiteral("0,128,255"));
+    EXPECT_EQ(s->GetDefaultBackgroundImage(), QStringLiteral("/pics/a|b\\c.png"));
+    EXPECT_EQ(s->GetDefaultFont(), QStringLiteral("Noto \\ Sans"));
+    EXPECT_EQ(s->GetDefaultFontSize(), 18);
+    EXPECT_TRUE(s->GetKeepOnTop());
+    EXPECT_EQ(s->GetLastSelectedItemId(), QStringLiteral("0F8FAD5B-D9CB-469F-A165-70867728950E"));
+    EXPECT_TRUE(s->GetLaunchAppOnStart());
+    EXPECT_EQ(s->GetMaxLinkedDocuments(), 7);
+    EXPECT_FALSE(s->GetShowAllTypes());
+    EXPECT_FALSE(s->GetShowFrame());
+    EXPECT_TRUE(s->GetShowOpenedItemsOnly());
+    EXPECT_TRUE(s->GetShowPdf());
+    EXPECT_FALSE(s->IsDirty()) << "loading is not a change";
+
+    QFile::remove(FilePath());
+    ASSERT_TRUE(s->Save());
+    EXPECT_EQ(FileBytes(), Utf16Le(text));
+
+    // A fresh object reads the same values back from what was written.
+    NavigatorSettings::DestroyInstance();
+    ASSERT_TRUE(Settings()->Load());
+    EXPECT_EQ(Settings()->GetDefaultBackgroundImage(), QStringLiteral("/pics/a|b\\c.png"));
+    EXPECT_EQ(Settings()->GetApplicationPosition(), (WindowRect{-20, 30, 380, 730}));
+}
+
+TEST_F(SettingsFileTest, PositionIsPutBackOnTheVirtualScreen) {
+    EXPECT_EQ(PositionAfterLoading(u"100,50,400,300"), (WindowRect{100, 50, 500, 350}));
+    EXPECT_EQ(PositionAfterLoading(u"-5000,-5000,10,10"), (WindowRect{0, 0, 280, 650}));
+    // Only the axis that is off the screen is reset.
+    EXPECT_EQ(PositionAfterLoading(u"90000,40,300,200"), (WindowRect{0, 40, 280, 240}));
+    EXPECT_EQ(PositionAfterLoading(u"60,90000,300,200"), (WindowRect{60, 0, 360, 650}));
+    // Partly off the screen stays where it is.
+    EXPECT_EQ(PositionAfterLoading(u"-100,-20,300,200"), (WindowRect{-100, -20, 200, 180}));
+}
+
+TEST_F(SettingsFileTest, PositionWithMissingNumbers) {
+    Settings()->SetApplicationPosition({10, 20, 300, 400});
+    EXPECT_EQ(PositionAfterLoading(u"100,50,400"), (WindowRect{10, 20, 300, 400}))
+        << "a rectangle is not built from missing numbers";
+    EXPECT_EQ(PositionAfterLoading(u"100,x,400,300"), (WindowRect{10, 20, 300, 400}));
+    EXPECT_EQ(PositionAfterLoading(u""), WindowRect{});
+}
+
+TEST_F(SettingsFileTest, NumbersReadLikeTheCLibrary) {
+    WriteSettings(Utf16Le(u"defaultfontsize| +24pt|maxlinkeddocuments|many|"));
+    ASSERT_TRUE(Settings()->Load());
+    EXPECT_EQ(Settings()->GetDefaultFontSize(), 24);
+    EXPECT_EQ(Settings()->GetMaxLinkedDocuments(), 0);
+
+    WriteSettings(Utf16Le(u"defaultfontsize|-3|maxlinkeddocuments|99999999999|"));
+    ASSERT_TRUE(Settings()->Load());
+    EXPECT_EQ(Settings()->GetDefaultFontSize(), -3);
+    EXPECT_EQ(Settings()->GetMaxLinkedDocuments(), 2147483647);
+}
+
+TEST_F(SettingsFileTest, DamagedContentAndUnknownKeys) {
+    // A byte-order mark becomes part of the first key, so that key is not recognised; text
+    // after a zero unit and an unterminated pair are ignored.
+    QByteArray bytes = QByteArray("\xFF\xFE", 2) + Utf16Le(u"applicationposition|100,50,400,300|");
+    bytes += Utf16Le(u"keepontop|TRUE|showframe|yes|zzunknown|1|defaultfont|Arial|");
+    bytes += QByteArray("\0\0", 2) + Utf16Le(u"launchapponstart|true|");
+    WriteSettings(bytes);
+    ASSERT_TRUE(Settings()->Load());
+
+    EXPECT_EQ(Settings()->GetApplicationPosition(), WindowRect{});
+    EXPECT_TRUE(Settings()->GetKeepOnTop());
+    EXPECT_FALSE(Settings()->GetShowFrame());
+    EXPECT_EQ(Settings()->GetDefaultFont(), QStringLiteral("Arial"));
+    EXPECT_FALSE(Settings()->GetLaunchAppOnStart());
+
+    ASSERT_TRUE(Settings()->Save());
+    EXPECT_EQ(FileBytes(),
+              Utf16Le(u"applicationposition|0,0,0,0|cleandeletedonclose|false|"
+                      u"defaultbackgroundcolor|255,255,255|defaultbackgroundimage||"
+                      u"defaultfont|Arial|defaultfontsize|12|keepontop|true|lastselecteditemid||"
+                      u"launchapponstart|false|maxlinkeddocuments|100|showalltypes|true|"
+                      u"showdoc|false|showframe|false|showmessagecentre|true|shownotes|false|"
+                      u"showopeneditemsonly|false|showpdf|false|showqmd|false|"));
+}
+
+TEST_F(SettingsFileTest, TruncatedOrUnreadableFileKeepsTheDefaults) {
+    WriteSettings(Utf16Le(u"keepontop|true|maxlinkeddocuments|5|") + QByteArray("x"));
+    EXPECT_FALSE(Settings()->Load()) << "half a code unit at the end";
+    ExpectDefaults();
+
+    QFile::remove(FilePath());
+    ASSERT_TRUE(QDir().mkpath(FilePath()));
+    EXPECT_FALSE(Settings()->Load());
+    ExpectDefaults();
+}
+
+TEST_F(SettingsFileTest, SaveFailsWhenTheFolderCannotBeMade) {
+    WriteFile(QStringLiteral("data/Brindle"), "a file where the folder belongs");
+    EXPECT_FALSE(Settings()->Save());
+    EXPECT_FALSE(QFile::exists(FilePath()));
+}
+
+TEST_F(SettingsFileTest, SaveIfDirtyWritesOnceAndClearsTheFlagEvenOnFailure) {
+    Settings()->SaveIfDirty();
+    EXPECT_FALSE(QFile::exists(FilePath())) << "nothing to save";
+
+    Settings()->SetKeepOnTop(true);
+    EXPECT_TRUE(Settings()->IsDirty());
+    Settings()->SaveIfDirty();
+    EXPECT_FALSE(Settings()->IsDirty());
+    EXPECT_TRUE(FileBytes().contains(Utf16Le(u"keepontop|true|")));
+
+    ASSERT_TRUE(QDir(DataHome() + QStringLiteral("/Brindle")).removeRecursively());
+    WriteFile(QStringLiteral("data/Brindle"), "blocks the folder");
+    Settings()->SetShowFrame(false);
+    Settings()->SaveIfDirty();
+    EXPECT_FALSE(Settings()->IsDirty());
+}
