@@ -1,0 +1,52 @@
+#pragma once
+
+#include <QString>
+
+#include <pugixml.hpp>
+
+#include <memory>
+
+namespace Brindle::Data::XmlAccess {
+
+// One catalog document in memory: opened, loaded from and saved to its file.
+class XmlDataStoreBase {
+public:
+    // Catalogs nested deeper than this are refused at load, like malformed ones: the DOM's
+    // own node removal recurses, and no walk over a refused file can overflow the stack.
+    static constexpr int kMaxDepth = 512;
+
+    explicit XmlDataStoreBase(const QString& path);
+    virtual ~XmlDataStoreBase();
+    XmlDataStoreBase(const XmlDataStoreBase&) = delete;
+    XmlDataStoreBase& operator=(const XmlDataStoreBase&) = delete;
+
+    // Creates the (empty) document; answers whether the store is open.
+    virtual bool Initialize();
+    // Drops the document; always true.
+    virtual bool Close();
+    // Replaces the document with the file's content. On failure (unreadable, malformed, no
+    // document element, nested too deep) the document is left empty and saving is refused
+    // until a later load succeeds, so the broken file is never written over.
+    virtual bool LoadFrom(const QString& path);
+    bool Load() { return LoadFrom(m_path); }
+    // Writes the whole document as UTF-16 LE with byte-order mark through a temporary file,
+    // so a failed write leaves the previous file whole.
+    virtual bool SaveTo(const QString& path);
+    bool Save() { return SaveTo(m_path); }
+    virtual bool IsOpen() const;
+
+    const QString& Path() const { return m_path; }
+    // The document; empty while the store is closed.
+    const pugi::xml_document& Document() const;
+
+protected:
+    pugi::xml_document* MutableDocument() { return m_document.get(); }
+
+private:
+    int m_open = 0;
+    std::unique_ptr<pugi::xml_document> m_document;
+    QString m_path;
+    bool m_loadFailed = false;
+};
+
+} // namespace Brindle::Data::XmlAccess

@@ -1,0 +1,231 @@
+#include "CatalogTestSupport.h"
+
+#include "catalog/IDataStoreService.h"
+#include "common/ReleasePtr.h"
+#include "dataexchange/CBasicStringIDReporter.h"
+#include "dataexchange/CRecursiveChildrenReporter.h"
+#include "dataexchange/WProperties.h"
+#include "libs/toolwell/IDataStoreHost.h"
+
+#include <QDir>
+#include <QFileInfo>
+
+#include <initializer_list>
+#include <utility>
+
+namespace {
+
+using DataExchange::IProperties;
+const QString kRoot = QStringLiteral("root");
+
+ReleasePtr<IProperties>
+Properties(std::initializer_list<std::pair<const char*, const char*>> pairs) {
+    ReleasePtr<IProperties> properties(DataExchange::CreateProperties());
+    for (const auto& [name, value] : pairs)
+        properties->SetProperty(QString::fromUtf8(name), QString::fromUtf8(value));
+    return properties;
+}
+
+// The item's property names in the order the catalog file holds them.
+QStringList SavedPropertyOrder(const QString& catalog, const QString& id) {
+    pugi::xml_document document;
+    if (!ParseSaved(catalog, &document))
+        return {};
+    pugi::xpath_variable_set variables;
+    variables.add("id", pugi::xpath_type_string);
+    variables.set("id", id.toUtf8().constData());
+    const pugi::xpath_query query("/archive/items/*[@uuid=$id]/properties/*", &variables);
+    QStringList names;
+    for (const pugi::xpath_node& n : query.evaluate_node_set(document))
+        names.append(QString::fromUtf8(n.node().name()));
+    return names;
+}
+
+class DataStoreServiceTest : public AmbrelTest {
+protected:
+    void SetUp() override {
+        AmbrelTest::SetUp();
+        m_host.reset(GetDataStoreHost());
+        m_host->GetCatalogPath(&m_catalog, nullptr);
+    }
+
+    IDataStoreService* Service() {
+        IDataStoreService* service = GetDataStoreService();
+        if (service == nullptr)
+            service = CreateDataStoreService(m_host.get());
+        EXPECT_NE(service, nullptr);
+        return service;
+    }
+
+    QString Create(const char* kind, IProperties* properties) {
+        QString id;
+        UnicodeStringPtr sink(&id);
+        const QByteArray k(kind);
+        HRESULT result = E_FAIL;
+        if (k == "note")
+            result = Service()->CreateNote(properties, &sink);
+        else if (k == "folder")
+            result = Service()->CreateFolder(properties, &sink);
+        else
+            result = Service()->CreateDocument(properties, &sink);
+        EXPECT_EQ(result, S_OK);
+        return id;
+    }
+
+    QString Property(const QString& id, const QString& name) {
+        ReleasePtr<IProperties> properties(DataExchange::CreateProperties());
+        Service()->GetProperties(id, properties.get());
+        QString value;
+        UnicodeStringPtr sink(&value);
+        properties->GetProperty(name, &sink);
+        return value;
+    }
+
+    ReleasePtr<IDataStoreHost> m_host;
+    QString m_catalog;
+};
+
+TEST_F(DataStoreServiceTest, ServiceIsCreatedOnceAndCanBeCreatedAgainAfterShutdown) {
+    EXPECT_EQ(CreateDataStoreService(nullptr), nullptr);
+    IDataStoreService* service = CreateDataStoreService(m_host.get());
+    ASSERT_NE(service, nullptr);
+    EXPECT_EQ(GetDataStoreService(), service);
+    EXPECT_EQ(CreateDataStoreService(m_host.get()), service);
+    EXPECT_EQ(ReadBytes(m_catalog), ExpectedEmptyArchive());
+
+    const QString id = Create("note", Properties({{"title", "kept"}}).get());
+    service->Shutdown(1);
+    EXPECT_EQ(GetDataStoreService(), nullptr);
+    EXPECT_EQ(Property(id, QStringLiteral("title")), QStringLiteral("kept"));
+}
+
+TEST_F(DataStoreServiceTest, CreationFillsPropertiesAndMakesOnlyNoteFolders) {
+    EXPECT_EQ(Service()->CreateNote(nullptr, nullptr), E_FAIL);
+    const QString note = Create("note", Properties({{"type", "note"}, {"title", "N"}}).get());
+    const QString folder = Create("folder", nullptr);
+    const QString document = Create("document", Properties({{"title", "D"}}).get());
+    QString itemFolder;
+    EXPECT_EQ(m_host->GetItemFolder(&itemFolder, note, false), 1);
+    EXPECT_EQ(m_host->GetItemFolder(&itemFolder, folder, false), 0);
+    EXPECT_EQ(m_host->GetItemFolder(&itemFolder, document, false), 0);
+    EXPECT_EQ(Property(note, QStringLiteral("title")), QStringLiteral("N"));
+
+    ReleasePtr<IProperties> empty(DataExchange::CreateProperties());
+    EXPECT_EQ(Service()->GetProperties(folder, empty.get()), E_FAIL);
+    EXPECT_EQ(Service()->GetProperties(note, nullptr), E_FAIL);
+    EXPECT_EQ(Service()->GetProperties(QString(), empty.get()), E_FAIL);
+
+    DataExchange::CBasicStringIDReporter children;
+    EXPECT_EQ(Service()->ReportChildren(kRoot, &children), S_OK);
+    EXPECT_EQ(children.StringIDs(), (QStringList{note, folder, document}));
+}
+
+TEST_F(DataStoreServiceTest, LinkingTheSamePathTwiceHandsOutTheFirstDocument) {
+    const auto linked = Properties({{"path", "/home/user/it's.pdf"}, {"linked", "true"}});
+    const QString first = Create("document", linked.get());
+    const QString second = Create("document", linked.get());
+    EXPECT_EQ(second, first);
+    DataExchange::CBasicStringIDReporter children;
+    Service()->ReportChildren(kRoot, &children);
+    EXPECT_EQ(children.StringIDs(), QStringList{first});
+
+    // Stored copies have an empty path; they are distinct documents.
+    const auto copy = Properties({{"path", ""}, {"filename", "a.pdf"}});
+    EXPECT_NE(Create("document", copy.get()), Create("document", copy.get()));
+}
+
+TEST_F(DataStoreServiceTest, SetReplacesAllPropertiesAndUpdateReplacesNamedOnes) {
+    const QString id =
+        Create("note", Properties({{"title", "Old"}, {"type", "note"}, {"size", "525,400"}}).get());
+    ASSERT_EQ(Service()->Save(), S_OK);
+    EXPECT_EQ(
+        SavedPropertyOrder(m_catalog, id),
+        (QStringList{QStringLiteral("size"), QStringLiteral("title"), QStringLiteral("type")}));
+
+    EXPECT_EQ(Service()->UpdateProperties(id, Properties({{"title", "New"}}).get()), S_OK);
+    ASSERT_EQ(Service()->Save(), S_OK);
+    EXPECT_EQ(
+        SavedPropertyOrder(m_catalog, id),
+        (QStringList{QStringLiteral("size"), QStringLiteral("type"), QStringLiteral("title")}));
+    EXPECT_EQ(Property(id, QStringLiteral("title")), QStringLiteral("New"));
+
+    EXPECT_EQ(Service()->SetProperties(id, Properties({}).get()), S_FALSE);
+    EXPECT_EQ(Property(id, QStringLiteral("size")), QStringLiteral("525,400"));
+
+    EXPECT_EQ(Service()->SetProperties(id, Properties({{"open", "true"}}).get()), S_OK);
+    ASSERT_EQ(Service()->Save(), S_OK);
+    EXPECT_EQ(SavedPropertyOrder(m_catalog, id), QStringList{QStringLiteral("open")});
+
+    EXPECT_EQ(Service()->SetProperties(id, Properties({{"bad name", "x"}}).get()), E_FAIL);
+    EXPECT_EQ(
+        Service()->UpdateProperties(QStringLiteral("missing"), Properties({{"title", "x"}}).get()),
+        E_FAIL);
+    EXPECT_EQ(Service()->SetProperties(id, nullptr), E_FAIL);
+}
+
+TEST_F(DataStoreServiceTest, ChildrenAndDescendantsOfFolders) {
+    const QString outer = Create("folder", nullptr);
+    const QString inner = Create("folder", nullptr);
+    const QString note = Create("note", Properties({{"title", "n"}}).get());
+    const QString empty = Create("folder", nullptr);
+    ASSERT_EQ(Service()->MoveItem(inner, outer), S_OK);
+    ASSERT_EQ(Service()->MoveItem(note, inner), S_OK);
+    ASSERT_EQ(Service()->MoveItemBefore(empty, outer, inner), S_OK);
+
+    DataExchange::CBasicStringIDReporter children;
+    EXPECT_EQ(Service()->ReportChildren(empty, &children), E_FAIL);
+    CRecursiveChildrenReporter descendants;
+    EXPECT_EQ(Service()->ReportDescendants(empty, &descendants), 0);
+    EXPECT_EQ(Service()->ReportDescendants(kRoot, &descendants), 4);
+    EXPECT_EQ(descendants.Items(), (QStringList{outer, empty, inner, note}));
+
+    EXPECT_EQ(Service()->MoveItem(outer, note), E_FAIL);
+    EXPECT_EQ(Service()->MoveItem(QString(), kRoot), E_FAIL);
+    EXPECT_EQ(Service()->DeleteItem(kRoot), E_FAIL);
+    EXPECT_EQ(Service()->DeleteItem(outer), S_OK);
+    EXPECT_EQ(Service()->ReportChildren(kRoot, &children), E_FAIL);
+}
+
+TEST_F(DataStoreServiceTest, SuspendedServiceRefusesEverythingAndLeavesTheFileAlone) {
+    const QString id = Create("note", Properties({{"title", "t"}}).get());
+    const QByteArray before = ReadBytes(m_catalog);
+    ASSERT_EQ(Service()->Suspend(), S_OK);
+    int suspended = 0;
+    EXPECT_EQ(Service()->IsSuspended(nullptr), E_FAIL);
+    EXPECT_EQ(Service()->IsSuspended(&suspended), S_OK);
+    EXPECT_EQ(suspended, 1);
+    EXPECT_EQ(Service()->Save(), E_FAIL);
+    EXPECT_EQ(Service()->CreateFolder(nullptr, nullptr), E_FAIL);
+    EXPECT_EQ(Service()->UpdateProperties(id, Properties({{"title", "u"}}).get()), E_FAIL);
+    CRecursiveChildrenReporter descendants;
+    EXPECT_EQ(Service()->ReportDescendants(kRoot, &descendants), E_FAIL);
+    EXPECT_EQ(ReadBytes(m_catalog), before);
+
+    ASSERT_EQ(Service()->Resume(), S_OK);
+    EXPECT_EQ(Service()->Save(), S_OK);
+    EXPECT_NE(ReadBytes(m_catalog), before);
+    EXPECT_EQ(Property(id, QStringLiteral("title")), QStringLiteral("t"));
+}
+
+TEST_F(DataStoreServiceTest, CatalogThatFailedToLoadSurvivesShutdownUntouched) {
+    const QByteArray broken("<?xml version=\"1.0\"?><archive><organization><root>");
+    QDir().mkpath(QFileInfo(m_catalog).path());
+    QFile file(m_catalog);
+    ASSERT_TRUE(file.open(QIODevice::WriteOnly));
+    file.write(broken);
+    file.close();
+
+    IDataStoreService* service = CreateDataStoreService(m_host.get());
+    ASSERT_NE(service, nullptr);
+    EXPECT_EQ(service->Open(), E_FAIL);
+    EXPECT_EQ(service->CreateNote(Properties({{"title", "t"}}).get(), nullptr), E_FAIL);
+    CRecursiveChildrenReporter descendants;
+    EXPECT_EQ(service->ReportDescendants(kRoot, &descendants), 0);
+    EXPECT_EQ(service->Save(), E_FAIL);
+    service->Shutdown(1);
+    EXPECT_EQ(ReadBytes(m_catalog), broken);
+    EXPECT_EQ(QDir(QFileInfo(m_catalog).path()).entryList(QDir::Files),
+              QStringList{QStringLiteral("catalog.xml")});
+}
+
+} // namespace
