@@ -163,12 +163,3 @@ TEST_F(NavigatorSettingsTest, KeepsItsOwnReferencesUntilDestroyed) {
     NavigatorSettings::DestroyInstance();
     EXPECT_EQ(host->Release(), 0u);
 }
-
-TEST_F(NavigatorSettingsTest, InstanceIsOneObjectUntilDestroyed) {
-    NavigatorSettings* first = Settings();
-    EXPECT_EQ(Settings(), first);
-    first->SetDefaultFont(QStringLiteral("Arial"));
-    NavigatorSettings::DestroyInstance();
-    EXPECT_EQ(Settings()->GetDefaultFont(), QStringLiteral("Times New Roman"));
-    EXPECT_FALSE(Settings()->IsDirty());
-}

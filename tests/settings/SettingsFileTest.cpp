@@ -159,7 +159,8 @@ TEST_F(SettingsFileTest, DamagedContentAndUnknownKeys) {
     // A byte-order mark becomes part of the first key, so that key is not recognised; text
     // after a zero unit and an unterminated pair are ignored.
     QByteArray bytes = QByteArray("\xFF\xFE", 2) + Utf16Le(u"applicationposition|100,50,400,300|");
-    bytes += Utf16Le(u"keepontop|TRUE|showframe|yes|zzunknown|1|defaultfont|Arial|");
+    bytes += Utf16Le(u"keepontop|TRUE|showframe|yes|zzunknown|1|defaultfont|Arial|"
+                     u"defaultbackgroundcolor||");
     bytes += QByteArray("\0\0", 2) + Utf16Le(u"launchapponstart|true|");
     WriteSettings(bytes);
     ASSERT_TRUE(Settings()->Load());
@@ -168,12 +169,13 @@ TEST_F(SettingsFileTest, DamagedContentAndUnknownKeys) {
     EXPECT_TRUE(Settings()->GetKeepOnTop());
     EXPECT_FALSE(Settings()->GetShowFrame());
     EXPECT_EQ(Settings()->GetDefaultFont(), QStringLiteral("Arial"));
+    EXPECT_EQ(Settings()->GetDefaultBackgroundColor(), QString()) << "a present empty value";
     EXPECT_FALSE(Settings()->GetLaunchAppOnStart());
 
     ASSERT_TRUE(Settings()->Save());
     EXPECT_EQ(FileBytes(),
               Utf16Le(u"applicationposition|0,0,0,0|cleandeletedonclose|false|"
-                      u"defaultbackgroundcolor|255,255,255|defaultbackgroundimage||"
+                      u"defaultbackgroundcolor||defaultbackgroundimage||"
                       u"defaultfont|Arial|defaultfontsize|12|keepontop|true|lastselecteditemid||"
                       u"launchapponstart|false|maxlinkeddocuments|100|showalltypes|true|"
                       u"showdoc|false|showframe|false|showmessagecentre|true|shownotes|false|"

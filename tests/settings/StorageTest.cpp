@@ -2,7 +2,6 @@
 #include "dataexchange/WProperties.h"
 #include "settings/Bool.h"
 #include "settings/StorageRegistry.h"
-#include "settings/StringTemplate.h"
 #include "support/AmbrelTest.h"
 
 #include <QStringList>
@@ -38,45 +37,6 @@ private:
 };
 
 } // namespace
-
-TEST_F(StorageTest, BoolReadsTrueIgnoringCaseAndAnythingElseAsFalse) {
-    Bool flag(QStringLiteral("flag"), true);
-    flag.Load(m_set.get());
-    EXPECT_TRUE(flag.Value()) << "a missing key leaves the value";
-
-    for (const char* text : {"false", "yes", "1", "", "true "}) {
-        flag.SetValue(true);
-        m_set->SetProperty(QStringLiteral("flag"), QString::fromLatin1(text));
-        flag.Load(m_set.get());
-        EXPECT_FALSE(flag.Value()) << text;
-    }
-    for (const char* text : {"true", "TRUE", "tRuE"}) {
-        flag.SetValue(false);
-        m_set->SetProperty(QStringLiteral("flag"), QString::fromLatin1(text));
-        flag.Load(m_set.get());
-        EXPECT_TRUE(flag.Value()) << text;
-    }
-
-    flag.Save(m_set.get());
-    EXPECT_EQ(Get(QStringLiteral("flag")), QStringLiteral("true"));
-    flag.SetValue(false);
-    flag.Save(m_set.get());
-    EXPECT_EQ(Get(QStringLiteral("flag")), QStringLiteral("false"));
-}
-
-TEST_F(StorageTest, StringTemplateReplacesOnlyWhenTheKeyExists) {
-    StringTemplate font(QStringLiteral("font"), QStringLiteral("Serif"));
-    font.Load(m_set.get());
-    EXPECT_EQ(font.Value(), QStringLiteral("Serif"));
-
-    m_set->SetProperty(QStringLiteral("font"), QString());
-    font.Load(m_set.get());
-    EXPECT_TRUE(font.Value().isEmpty()) << "a present empty value replaces the text";
-
-    font.SetValue(QStringLiteral("Sans | Bold"));
-    font.Save(m_set.get());
-    EXPECT_EQ(Get(QStringLiteral("font")), QStringLiteral("Sans | Bold"));
-}
 
 TEST_F(StorageTest, StoragesRegisterForTheirLifetime) {
     auto flag = std::make_unique<Bool>(QStringLiteral("temporary"), true);
