@@ -1,0 +1,192 @@
+#include "platform/SharedMemory.h"
+
+#include "platform/AppFolders.h"
+
+#include <QFile>
+#include <QLocalServer>
+#include <QLocalSocket>
+#include <QStringDecoder>
+#include <QTimer>
+#include <QtEndian>
+
+#include <optional>
+
+#include <sys/socket.h>
+#include <unistd.h>
+
+namespace {
+
+// sockaddr_un holds 108 bytes with the terminating NUL; stay one below that.
+constexpr qsizetype kMaximumSocketPathBytes = 106;
+
+std::optional<QString> DecodeMessage(const QByteArray& bytes) {
+    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
+    QString text = decoder.decode(bytes);
+    if (decoder.hasError() || text.contains(QChar(0)))
+        return std::nullopt;
+    return text;
+}
+
+// Whether the sender has closed its end, after giving up waiting for the answer.
+bool PeerHungUp(QLocalSocket* socket) {
+    if (socket == nullptr || socket->state() != QLocalSocket::ConnectedState)
+        return true;
+    char next = 0;
+    return ::recv(int(socket->socketDescriptor()), &next, 1, MSG_PEEK | MSG_DONTWAIT) == 0;
+}
+
+} // namespace
+
+SharedMemory::SharedMemory(QObject* parent) : QObject(parent) {}
+
+SharedMemory::~SharedMemory() {
+    Close();
+}
+
+QString SharedMemory::SocketPath(const QString& name) {
+    if (name.isEmpty() || name.contains(u'/') || name == u"." || name == u"..")
+        return {};
+    const QString folder = Platform::RuntimeFolder();
+    if (folder.isEmpty())
+        return {};
+    const QString path = folder + u'/' + name;
+    if (QFile::encodeName(path).size() > kMaximumSocketPathBytes)
+        return {};
+    return path;
+}
+
+bool SharedMemory::PeerIsSameUser(qintptr socketDescriptor) {
+    ucred credentials{};
+    socklen_t length = sizeof credentials;
+    if (::getsockopt(int(socketDescriptor), SOL_SOCKET, SO_PEERCRED, &credentials, &length) != 0)
+        return false;
+    return credentials.uid == ::geteuid();
+}
+
+bool SharedMemory::Listen(const QString& name) {
+    Close();
+    const QString path = SocketPath(name);
+    if (path.isEmpty())
+        return false;
+    auto server = std::make_unique<QLocalServer>();
+    if (!server->listen(path)) {
+        if (server->serverError() != QAbstractSocket::AddressInUseError)
+            return false;
+        QLocalServer::removeServer(path);
+        if (!server->listen(path))
+            return false;
+    }
+    // The runtime folder is private already; the socket is kept so as well.
+    QFile::setPermissions(path, QFile::ReadOwner | QFile::WriteOwner);
+    m_server = std::move(server);
+    return true;
+}
+
+bool SharedMemory::IsListening() const {
+    return m_server && m_server->isListening();
+}
+
+QString SharedMemory::ServerPath() const {
+    return m_server ? m_server->fullServerName() : QString();
+}
+
+void SharedMemory::Publish(Handler handler) {
+    m_handler = std::move(handler);
+    if (!m_server)
+        return;
+    connect(m_server.get(), &QLocalServer::newConnection, this, &SharedMemory::AcceptPending,
+            Qt::UniqueConnection);
+    AcceptPending();
+}
+
+void SharedMemory::Close() {
+    m_received.clear();
+    if (!m_server)
+        return;
+    disconnect(m_server.get(), nullptr, this, nullptr);
+    m_server->close();
+    const auto sockets = m_server->findChildren<QLocalSocket*>(Qt::FindDirectChildrenOnly);
+    for (QLocalSocket* socket : sockets)
+        socket->abort();
+    // A handler may close the channel from inside a socket's signal: the sockets must outlive
+    // that call, so they go with the server once control is back in the event loop.
+    if (m_handling)
+        m_server.release()->deleteLater();
+    else
+        m_server.reset();
+}
+
+void SharedMemory::AcceptPending() {
+    while (m_server && m_server->hasPendingConnections()) {
+        QLocalSocket* socket = m_server->nextPendingConnection();
+        if (!PeerIsSameUser(socket->socketDescriptor())) {
+            socket->abort();
+            socket->deleteLater();
+            continue;
+        }
+        Watch(socket);
+    }
+}
+
+void SharedMemory::Watch(QLocalSocket* socket) {
+    connect(socket, &QLocalSocket::disconnected, socket, &QObject::deleteLater);
+    // A peer that stalls half-way is cut off instead of holding the connection for ever.
+    auto* patience = new QTimer(socket);
+    patience->setSingleShot(true);
+    connect(patience, &QTimer::timeout, socket, [socket] { socket->abort(); });
+    patience->start(kReadPatienceMs);
+
+    auto buffer = std::make_shared<QByteArray>();
+    auto reading = std::make_shared<QMetaObject::Connection>();
+    const auto read = [=, this] {
+        buffer->append(socket->readAll());
+        if (buffer->size() < 4)
+            return;
+        const quint32 length = qFromBigEndian<quint32>(buffer->constData());
+        if (length > quint32(kMaximumMessageBytes)) {
+            disconnect(*reading);
+            patience->stop();
+            Answer(socket, kAnswerRefused);
+            return;
+        }
+        if (buffer->size() < 4 + qsizetype(length))
+            return;
+        disconnect(*reading);
+        patience->stop();
+        std::optional<QString> text;
+        if (buffer->size() == 4 + qsizetype(length))
+            text = DecodeMessage(buffer->mid(4));
+        if (!text) {
+            Answer(socket, kAnswerRefused);
+            return;
+        }
+        m_received.append({socket, *text});
+        HandleReceived();
+    };
+    *reading = connect(socket, &QLocalSocket::readyRead, this, read);
+    if (socket->bytesAvailable() > 0)
+        read();
+}
+
+void SharedMemory::HandleReceived() {
+    // A handler that runs a nested event loop may let more messages in; they wait their turn.
+    if (m_handling)
+        return;
+    m_handling = true;
+    while (!m_received.isEmpty()) {
+        const Received next = m_received.takeFirst();
+        // A sender that stopped waiting has told its user that nothing happened; keep it so.
+        if (PeerHungUp(next.socket))
+            continue;
+        if (m_handler)
+            m_handler(next.text);
+        if (next.socket && next.socket->state() == QLocalSocket::ConnectedState)
+            Answer(next.socket, kAnswerDone);
+    }
+    m_handling = false;
+}
+
+void SharedMemory::Answer(QLocalSocket* socket, char answer) {
+    socket->write(&answer, 1);
+    socket->disconnectFromServer();
+}

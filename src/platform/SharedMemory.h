@@ -1,0 +1,71 @@
+#pragma once
+
+#include <QList>
+#include <QObject>
+#include <QPointer>
+#include <QString>
+
+#include <functional>
+#include <memory>
+
+class QLocalServer;
+class QLocalSocket;
+
+// The running navigator's announcement: a local socket named after the instance name in the
+// per-user runtime folder. A later start connects to it and hands over its command line.
+//
+// On the wire a message is a 4-byte big-endian length and that many bytes of UTF-8 text; the
+// answer is one byte, sent after the handler has returned. Connections of other users, texts
+// over the size limit, text that is not valid UTF-8 or holds a NUL, extra bytes and peers that
+// stall are dropped without ever waiting on them.
+class SharedMemory final : public QObject {
+    Q_OBJECT
+public:
+    using Handler = std::function<void(const QString& text)>;
+
+    static constexpr qsizetype kMaximumMessageBytes = 64 * 1024;
+    static constexpr char kAnswerDone = 'A';
+    static constexpr char kAnswerRefused = 'R';
+    // How long a connection may take to deliver its whole message.
+    static constexpr int kReadPatienceMs = 10000;
+
+    explicit SharedMemory(QObject* parent = nullptr);
+    ~SharedMemory() override;
+
+    // The socket path for an instance name; empty when there is no safe runtime folder, the
+    // name is not a plain file name or the path is too long for a local socket.
+    static QString SocketPath(const QString& name);
+
+    // Whether the peer on a connected local socket runs as the same user as this process.
+    static bool PeerIsSameUser(qintptr socketDescriptor);
+
+    // Starts listening. A socket file already at the path is taken for a dead navigator's and
+    // replaced, so call this only while holding the start-up mutex and after no navigator
+    // answered there.
+    bool Listen(const QString& name);
+    bool IsListening() const;
+    QString ServerPath() const;
+
+    // From now on messages are read and given to the handler one at a time, also those that
+    // waited since Listen. The answer goes back after the handler returned.
+    void Publish(Handler handler);
+
+    // Stops listening (the socket file goes) and drops every connection.
+    void Close();
+
+private:
+    struct Received {
+        QPointer<QLocalSocket> socket;
+        QString text;
+    };
+
+    void AcceptPending();
+    void Watch(QLocalSocket* socket);
+    void HandleReceived();
+    static void Answer(QLocalSocket* socket, char answer);
+
+    std::unique_ptr<QLocalServer> m_server;
+    Handler m_handler;
+    QList<Received> m_received;
+    bool m_handling = false;
+};
