@@ -1,6 +1,7 @@
 #include "support/AmbrelTest.h"
 
 #include "libs/toolwell/CHarborUtils.h"
+#include "libs/toolwell/ISnapshotService.h"
 #include "platform/IMessageBox.h"
 #include "platform/IProcessLauncher.h"
 #include "platform/IWaitCursor.h"
@@ -23,6 +24,7 @@ void ResetSingletons() {
     Platform::SetWaitCursor(nullptr);
     Platform::SetProcessLauncher(nullptr);
     Platform::Registry::SetMachineFile({});
+    SetSnapshotNoteHandler({});
 #ifdef AMBREL_WITH_CATALOG
     if (IDataStoreService* service = GetDataStoreService())
         service->Shutdown(0);
