@@ -4,41 +4,44 @@
 
 namespace Brindle::Data::XmlAccess {
 
-void NodeIndex::Add(const char* value, pugi::xml_node node) {
-    auto [it, inserted] = m_entries.try_emplace(value);
-    if (inserted)
-        it->second.node = node;
-    else
-        it->second.others.push_back(node);
+void NodeIndex::Add(pugi::xml_node node, pugi::xml_attribute attribute) {
+    auto [it, inserted] = m_entries.try_emplace(attribute.value(), Entry{{node, attribute}, {}});
+    if (!inserted)
+        it->second.others.push_back({node, attribute});
 }
 
-void NodeIndex::Remove(const char* value, pugi::xml_node node) {
-    const auto it = m_entries.find(value);
+void NodeIndex::Remove(pugi::xml_node node, pugi::xml_attribute attribute) {
+    const auto it = m_entries.find(attribute.value());
     if (it == m_entries.end())
         return;
     Entry& entry = it->second;
-    if (entry.node == node) {
+    const Holder gone{node, attribute};
+    if (entry.holder == gone) {
         if (entry.others.empty()) {
             m_entries.erase(it);
             return;
         }
-        entry.node = entry.others.back();
-        entry.others.pop_back();
+        // The key points into the leaving attribute: re-key on the one that takes its place.
+        auto handle = m_entries.extract(it);
+        handle.mapped().holder = handle.mapped().others.back();
+        handle.mapped().others.pop_back();
+        handle.key() = handle.mapped().holder.attribute.value();
+        m_entries.insert(std::move(handle));
         return;
     }
-    const auto other = std::find(entry.others.begin(), entry.others.end(), node);
+    const auto other = std::find(entry.others.begin(), entry.others.end(), gone);
     if (other != entry.others.end())
         entry.others.erase(other);
 }
 
-pugi::xml_node NodeIndex::First(const std::string& value) const {
+pugi::xml_node NodeIndex::First(std::string_view value) const {
     const auto it = m_entries.find(value);
     if (it == m_entries.end())
         return {};
-    pugi::xml_node first = it->second.node;
-    for (const pugi::xml_node& other : it->second.others) {
-        if (Precedes(other, first))
-            first = other;
+    pugi::xml_node first = it->second.holder.node;
+    for (const Holder& other : it->second.others) {
+        if (Precedes(other.node, first))
+            first = other.node;
     }
     return first;
 }

@@ -10,6 +10,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <string_view>
 #include <vector>
 
 namespace Brindle::Data::XmlAccess {
@@ -130,10 +131,6 @@ bool IsWhitespaceOnly(const QString& text) {
     return true;
 }
 
-std::string Utf8(const QString& text) {
-    return text.toUtf8().toStdString();
-}
-
 } // namespace
 
 XmlDataStore::XmlDataStore(const QString& path, IDataStoreHost* host)
@@ -152,7 +149,7 @@ XmlDataStore::~XmlDataStore() {
 
 bool XmlDataStore::Initialize() {
     const bool open = XmlDataStoreBase::Initialize();
-    RebuildIndexes();
+    ClearIndexes();
     if (!open)
         return false;
     if (m_host == nullptr)
@@ -172,40 +169,73 @@ bool XmlDataStore::Initialize() {
 
 bool XmlDataStore::Close() {
     XmlDataStoreBase::Close();
-    RebuildIndexes();
+    ClearIndexes();
     return true;
 }
 
 bool XmlDataStore::LoadFrom(const QString& path) {
+    if (!IsOpen() || path.isNull())
+        return false; // the document stays as it is
+    ClearIndexes();
     const bool loaded = XmlDataStoreBase::LoadFrom(path);
-    RebuildIndexes();
+    if (!loaded)
+        ClearIndexes();
     return loaded;
 }
 
-void XmlDataStore::RebuildIndexes() {
+void XmlDataStore::ClearIndexes() {
     m_itemsByUuid.Clear();
     m_nodesByUuidref.Clear();
     m_items = {};
     m_root = {};
-    if (!IsOpen())
-        return;
-    pugi::xml_document* document = MutableDocument();
-    m_items = document->select_node("/archive/items").node();
-    m_root = document->select_node("//archive/organization/root").node();
-    IndexSubtree(*document);
+}
+
+bool XmlDataStore::AcceptDocument(const pugi::xml_document& document) {
+    ClearIndexes();
+    // "/archive/items"
+    m_items = document.child("archive").child("items");
+    // One walk, no recursion: the depth bound, the first "//archive/organization/root" and
+    // every identifier attribute.
+    int depth = 0;
+    pugi::xml_node node = document.first_child();
+    while (node) {
+        if (node.type() == pugi::node_element) {
+            IndexElement(node);
+            if (!m_root && std::strcmp(node.name(), kRoot) == 0 &&
+                IsElementNamed(node.parent(), "organization") &&
+                IsElementNamed(node.parent().parent(), "archive"))
+                m_root = node;
+        }
+        if (node.first_child()) {
+            if (++depth >= kMaxDepth)
+                return false;
+            node = node.first_child();
+            continue;
+        }
+        while (node && !node.next_sibling()) {
+            node = node.parent();
+            --depth;
+        }
+        if (node)
+            node = node.next_sibling();
+    }
+    return true;
+}
+
+void XmlDataStore::IndexElement(pugi::xml_node element) {
+    const bool isChild = std::strcmp(element.name(), "child") == 0;
+    for (pugi::xml_attribute a = element.first_attribute(); a; a = a.next_attribute()) {
+        if (std::strcmp(a.name(), "uuid") == 0)
+            m_itemsByUuid.Add(element, a);
+        else if (isChild && std::strcmp(a.name(), "uuidref") == 0)
+            m_nodesByUuidref.Add(element, a);
+    }
 }
 
 void XmlDataStore::IndexSubtree(pugi::xml_node top) {
     for (pugi::xml_node n = top; n; n = NextInSubtree(n, top)) {
-        if (n.type() != pugi::node_element)
-            continue;
-        const bool isChild = std::strcmp(n.name(), "child") == 0;
-        for (pugi::xml_attribute a = n.first_attribute(); a; a = a.next_attribute()) {
-            if (std::strcmp(a.name(), "uuid") == 0)
-                m_itemsByUuid.Add(a.value(), n);
-            else if (isChild && std::strcmp(a.name(), "uuidref") == 0)
-                m_nodesByUuidref.Add(a.value(), n);
-        }
+        if (n.type() == pugi::node_element)
+            IndexElement(n);
     }
 }
 
@@ -216,9 +246,9 @@ void XmlDataStore::UnindexSubtree(pugi::xml_node top) {
         const bool isChild = std::strcmp(n.name(), "child") == 0;
         for (pugi::xml_attribute a = n.first_attribute(); a; a = a.next_attribute()) {
             if (std::strcmp(a.name(), "uuid") == 0)
-                m_itemsByUuid.Remove(a.value(), n);
+                m_itemsByUuid.Remove(n, a);
             else if (isChild && std::strcmp(a.name(), "uuidref") == 0)
-                m_nodesByUuidref.Remove(a.value(), n);
+                m_nodesByUuidref.Remove(n, a);
         }
     }
 }
@@ -252,17 +282,17 @@ QString XmlDataStore::CreateItem(const QString& kind) {
     if (!IsOpen() || !m_items || !m_root || !IsXmlName(kind))
         return {};
     const QString id = NewUuid();
-    const std::string idText = Utf8(id);
+    const QByteArray idText = id.toUtf8();
     pugi::xml_node item = m_items.append_child(kind.toUtf8().constData());
     if (!item)
         return {};
-    item.append_attribute("uuid") = idText.c_str();
+    item.append_attribute("uuid") = idText.constData();
     pugi::xml_node child = m_root.append_child("child");
     if (!child) {
         m_items.remove_child(item);
         return {};
     }
-    child.append_attribute("uuidref") = idText.c_str();
+    child.append_attribute("uuidref") = idText.constData();
     IndexSubtree(item);
     IndexSubtree(child);
     return id;
@@ -271,7 +301,8 @@ QString XmlDataStore::CreateItem(const QString& kind) {
 pugi::xml_node XmlDataStore::FindItem(const QString& id) const {
     if (!IsOpen())
         return {};
-    return m_itemsByUuid.First(Utf8(id));
+    const QByteArray key = id.toUtf8();
+    return m_itemsByUuid.First(std::string_view(key.constData(), key.size()));
 }
 
 pugi::xml_node XmlDataStore::FindOrganizationNode(const QString& id) const {
@@ -279,7 +310,8 @@ pugi::xml_node XmlDataStore::FindOrganizationNode(const QString& id) const {
         return {};
     if (id == QLatin1StringView(kRoot))
         return m_root;
-    return m_nodesByUuidref.First(Utf8(id));
+    const QByteArray key = id.toUtf8();
+    return m_nodesByUuidref.First(std::string_view(key.constData(), key.size()));
 }
 
 pugi::xml_node XmlDataStore::GetPropertiesNode(const QString& id) {

@@ -68,8 +68,13 @@ public:
     int Suspended() const { return m_suspended; }
     void SetSuspended(int suspended) { m_suspended = suspended; }
 
+protected:
+    // Checks the depth and builds the indexes in one pass over the document.
+    bool AcceptDocument(const pugi::xml_document& document) override;
+
 private:
-    void RebuildIndexes();
+    void ClearIndexes();
+    void IndexElement(pugi::xml_node element);
     void IndexSubtree(pugi::xml_node top);
     void UnindexSubtree(pugi::xml_node top);
     bool IsProtected(pugi::xml_node node) const;

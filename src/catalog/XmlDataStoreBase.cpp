@@ -86,8 +86,7 @@ bool XmlDataStoreBase::LoadFrom(const QString& path) {
     const QByteArray nativePath = QFile::encodeName(path);
     const pugi::xml_parse_result result = m_document->load_file(
         nativePath.constData(), pugi::parse_default | pugi::parse_declaration);
-    const bool loaded =
-        result && m_document->document_element() && DepthWithin(*m_document, kMaxDepth);
+    const bool loaded = result && m_document->document_element() && AcceptDocument(*m_document);
     if (!loaded)
         m_document->reset(); // a failed parse leaves a partial tree behind
     m_loadFailed = !loaded;
@@ -105,6 +104,10 @@ bool XmlDataStoreBase::SaveTo(const QString& path) {
     m_document->save(writer, "\t", pugi::format_default | pugi::format_write_bom,
                      pugi::encoding_utf16_le);
     return file.commit();
+}
+
+bool XmlDataStoreBase::AcceptDocument(const pugi::xml_document& document) {
+    return DepthWithin(document, kMaxDepth);
 }
 
 bool XmlDataStoreBase::IsOpen() const {

@@ -41,6 +41,9 @@ public:
 
 protected:
     pugi::xml_document* MutableDocument() { return m_document.get(); }
+    // Called once on every freshly parsed document; false refuses it like a malformed file.
+    // The default refuses documents nested deeper than kMaxDepth.
+    virtual bool AcceptDocument(const pugi::xml_document& document);
 
 private:
     int m_open = 0;
