@@ -2,9 +2,11 @@
 
 #include "app/IdlePass.h"
 #include "libs/toolwell/IHarborUtils.h"
+#include "settings/NavigatorSettings.h"
 #include "ui/QtMessageBox.h"
 #include "ui/QtWaitCursor.h"
 #include "ui/TerminationSignals.h"
+#include "ui/WMainFrame.h"
 
 #include <QApplication>
 
@@ -46,6 +48,10 @@ bool CNavigatorApp::InitInstance() {
     if (!m_applicationInfo)
         return false;
 
+    NavigatorSettings* settings = NavigatorSettings::Instance();
+    settings->SetApplicationInfo(m_applicationInfo.get());
+    settings->Load();
+
     IHarborUtils* utils = GetHarborUtilsInterface();
     if (utils == nullptr || !utils->IsReady() || !utils->IsEnabled())
         return false;
@@ -54,12 +60,20 @@ bool CNavigatorApp::InitInstance() {
     m_dataStoreHost.reset(GetDataStoreHost());
     if (!m_dataStoreHost)
         return false;
+    settings->SetDataStoreHost(m_dataStoreHost.get());
 
-    m_mainWindow = new QMainWindow;
+    m_mainWindow = new WMainFrame;
     m_mainWindow->setAttribute(Qt::WA_DeleteOnClose);
-    m_mainWindow->setWindowTitle(QStringLiteral("Quillmark Ambrel"));
     PlaceMainWindow();
     m_mainWindow->show();
+
+    m_mainWindow->SetTrackPosition(true);
+    settings->SetFrame(m_mainWindow);
+
+    // The window options are applied through their settings, which also shows them at once.
+    settings->SetKeepOnTop(settings->GetKeepOnTop());
+    settings->SetShowMessageCentre(settings->GetShowMessageCentre());
+    settings->SetShowFrame(settings->GetShowFrame());
 
     m_terminationSignals = std::make_unique<TerminationSignals>();
     connect(m_terminationSignals.get(), &TerminationSignals::Received, this, [this] {
@@ -73,7 +87,11 @@ bool CNavigatorApp::InitInstance() {
 }
 
 void CNavigatorApp::PlaceMainWindow() {
-    m_mainWindow->setGeometry(0, 0, kDefaultWidth, kDefaultHeight);
+    // The stored place wins; a stored width or height of 0 keeps the default.
+    const WindowRect stored = NavigatorSettings::Instance()->GetApplicationPosition();
+    const int width = stored.Width() != 0 ? stored.Width() : kDefaultWidth;
+    const int height = stored.Height() != 0 ? stored.Height() : kDefaultHeight;
+    m_mainWindow->setGeometry(stored.left, stored.top, width, height);
 }
 
 bool CNavigatorApp::OnIdle(int count) {
@@ -81,11 +99,14 @@ bool CNavigatorApp::OnIdle(int count) {
         QCoreApplication::exit(0);
         return false;
     }
+    NavigatorSettings::Instance()->SaveIfDirty();
     return count < 1;
 }
 
 int CNavigatorApp::ExitInstance() {
     m_terminationSignals.reset();
+    if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->IsDirty())
+        settings->Save();
     m_dataStoreHost.reset();
     ReleaseHarborUtilsInterface();
     m_applicationInfo.reset();

@@ -3,8 +3,8 @@
 #include "app/ApplicationInfo.h"
 #include "common/ReleasePtr.h"
 #include "libs/toolwell/IDataStoreHost.h"
+#include "ui/WMainFrame.h"
 
-#include <QMainWindow>
 #include <QObject>
 #include <QPointer>
 
@@ -27,7 +27,7 @@ public:
     bool OnIdle(int count);
     int ExitInstance();
 
-    QMainWindow* MainWindow() const { return m_mainWindow; }
+    WMainFrame* MainWindow() const { return m_mainWindow; }
     Brindle::Application::IApplicationInfo* ApplicationInfoObject() const {
         return m_applicationInfo.get();
     }
@@ -37,7 +37,7 @@ private:
 
     ReleasePtr<Brindle::Application::IApplicationInfo> m_applicationInfo;
     ReleasePtr<IDataStoreHost> m_dataStoreHost;
-    QPointer<QMainWindow> m_mainWindow;
+    QPointer<WMainFrame> m_mainWindow;
     std::unique_ptr<IdlePass> m_idlePass;
     std::unique_ptr<TerminationSignals> m_terminationSignals;
     int m_exitCode = 0;

@@ -1,8 +1,10 @@
 #include "app/CNavigatorApp.h"
 #include "libs/toolwell/CHarborUtils.h"
+#include "settings/NavigatorSettings.h"
 #include "support/AmbrelTest.h"
 
 #include <QApplication>
+#include <QFile>
 
 namespace {
 
@@ -28,7 +30,27 @@ public:
     QList<bool> shuttingDownCalls;
 };
 
-class NavigatorAppTest : public AmbrelTest {};
+class NavigatorAppTest : public AmbrelTest {
+protected:
+    // A settings file holding just these pipe-delimited pairs, as UTF-16 little-endian.
+    void WriteSettings(const QString& pairs) {
+        QByteArray bytes;
+        for (const QChar c : pairs) {
+            bytes.append(static_cast<char>(c.unicode() & 0xFF));
+            bytes.append(static_cast<char>(c.unicode() >> 8));
+        }
+        WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/NavSettings.dat"), bytes);
+    }
+
+    QString ReadSettings() const {
+        QFile file(AppDataFolder() + QStringLiteral("/NavSettings.dat"));
+        if (!file.open(QIODevice::ReadOnly))
+            return {};
+        const QByteArray bytes = file.readAll();
+        return QString::fromUtf16(reinterpret_cast<const char16_t*>(bytes.constData()),
+                                  bytes.size() / 2);
+    }
+};
 
 TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
     for (const bool ready : {false, true}) {
@@ -63,6 +85,48 @@ TEST_F(NavigatorAppTest, StartUpShowsTheWindowAtItsDefaultPlace) {
     EXPECT_FALSE(app.OnIdle(0));
     EXPECT_EQ(app.ExitInstance(), 0);
     EXPECT_NE(GetHarborUtilsInterface(), &utils);
+}
+
+TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlace) {
+    WriteSettings(QStringLiteral("applicationposition|100,50,400,300|"));
+    CNavigatorApp app;
+    ASSERT_TRUE(app.InitInstance());
+    EXPECT_EQ(app.MainWindow()->geometry(), QRect(100, 50, 400, 300));
+    delete app.MainWindow();
+    app.ExitInstance();
+}
+
+TEST_F(NavigatorAppTest, AStoredWidthOfZeroKeepsTheDefaultWidthButNotThePlace) {
+    WriteSettings(QStringLiteral("applicationposition|30,40,0,500|"));
+    CNavigatorApp app;
+    ASSERT_TRUE(app.InitInstance());
+    EXPECT_EQ(app.MainWindow()->geometry(), QRect(30, 40, 280, 500));
+    delete app.MainWindow();
+    app.ExitInstance();
+}
+
+TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
+    CNavigatorApp app;
+    ASSERT_TRUE(app.InitInstance());
+    NavigatorSettings* settings = NavigatorSettings::Instance();
+    EXPECT_TRUE(app.OnIdle(0)) << "the first pass asks for one more";
+    EXPECT_FALSE(settings->IsDirty());
+    EXPECT_FALSE(ReadSettings().isEmpty()) << "applying the window options marks them dirty";
+
+    app.MainWindow()->setGeometry(120, 80, 300, 600);
+    EXPECT_TRUE(settings->IsDirty());
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 420, 680}));
+    app.OnIdle(0);
+    EXPECT_FALSE(settings->IsDirty());
+
+    EXPECT_TRUE(ReadSettings().startsWith(QStringLiteral("applicationposition|120,80,300,600|")))
+        << ReadSettings().toStdString();
+
+    // A change after the last idle pass still reaches the file at shut-down.
+    settings->SetKeepOnTop(true);
+    delete app.MainWindow();
+    app.ExitInstance();
+    EXPECT_TRUE(ReadSettings().contains(QStringLiteral("|keepontop|true|")));
 }
 
 } // namespace

@@ -1,0 +1,55 @@
+#include "ui/WMainFrame.h"
+
+#include "settings/NavigatorSettings.h"
+
+WMainFrame::WMainFrame(QWidget* parent) : QMainWindow(parent) {
+    setWindowTitle(QStringLiteral("Quillmark Ambrel"));
+}
+
+WMainFrame::~WMainFrame() {
+    // The settings outlive the window.
+    if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->GetFrame() == this)
+        settings->SetFrame(nullptr);
+}
+
+void WMainFrame::SetKeepOnTop(bool onTop) {
+    if (windowFlags().testFlag(Qt::WindowStaysOnTopHint) == onTop) {
+        show();
+        return;
+    }
+    // Changing a window flag hides the window; it is shown again at the same place.
+    setWindowFlag(Qt::WindowStaysOnTopHint, onTop);
+    show();
+}
+
+void WMainFrame::ShowFrame(bool show) {
+    if (windowFlags().testFlag(Qt::FramelessWindowHint) == !show)
+        return;
+    const bool visible = isVisible();
+    setWindowFlag(Qt::FramelessWindowHint, !show);
+    if (visible)
+        this->show();
+}
+
+// There is no message centre bar on this platform yet; the option is kept for when it comes.
+void WMainFrame::ShowMessageCentre(bool) {}
+
+void WMainFrame::moveEvent(QMoveEvent* event) {
+    QMainWindow::moveEvent(event);
+    RecordPosition();
+}
+
+void WMainFrame::resizeEvent(QResizeEvent* event) {
+    QMainWindow::resizeEvent(event);
+    RecordPosition();
+}
+
+void WMainFrame::RecordPosition() {
+    // A minimised or maximised window keeps the place it will return to.
+    if (!m_trackPosition || isMinimized() || isMaximized() || isFullScreen())
+        return;
+    NavigatorSettings* settings = NavigatorSettings::Instance();
+    const WindowRect position = WindowRect::FromGeometry(geometry());
+    if (settings->GetApplicationPosition() != position)
+        settings->SetApplicationPosition(position);
+}

@@ -1,0 +1,29 @@
+#pragma once
+
+#include "settings/ISettingsWindow.h"
+
+#include <QMainWindow>
+
+// The navigator's main window. It applies the window options of the settings and, once
+// tracking is on, writes its moves and resizes to them.
+class WMainFrame final : public QMainWindow, public ISettingsWindow {
+    Q_OBJECT
+public:
+    explicit WMainFrame(QWidget* parent = nullptr);
+    ~WMainFrame() override;
+
+    void SetTrackPosition(bool track) { m_trackPosition = track; }
+
+    void SetKeepOnTop(bool onTop) override;
+    void ShowFrame(bool show) override;
+    void ShowMessageCentre(bool show) override;
+
+protected:
+    void moveEvent(QMoveEvent* event) override;
+    void resizeEvent(QResizeEvent* event) override;
+
+private:
+    void RecordPosition();
+
+    bool m_trackPosition = false;
+};
