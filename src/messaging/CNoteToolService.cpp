@@ -50,9 +50,11 @@ INoteToolService* CNoteToolService::GetInstance() {
     return g_instance;
 }
 
-void CNoteToolService::DestroyInstance() {
-    delete g_instance;
+void CNoteToolService::ResetInstance() {
+    CNoteToolService* old = g_instance;
     g_instance = nullptr;
+    if (old != nullptr && old->m_references == 0)
+        delete old;
 }
 
 unsigned long CNoteToolService::Release() {

@@ -24,9 +24,11 @@ IViewerService* CViewerService::GetInstance() {
     return g_instance;
 }
 
-void CViewerService::DestroyInstance() {
-    delete g_instance;
+void CViewerService::ResetInstance() {
+    CViewerService* old = g_instance;
     g_instance = nullptr;
+    if (old != nullptr && old->m_references == 0)
+        delete old;
 }
 
 unsigned long CViewerService::Release() {

@@ -11,8 +11,9 @@ class CViewerService final : public IViewerService {
 public:
     // The singleton with one more reference for the caller, made on the first call.
     static IViewerService* GetInstance();
-    // Destroys the singleton whatever references remain, so that a test starts afresh.
-    static void DestroyInstance();
+    // Forgets the singleton, so that the next GetInstance makes a fresh one (a test starts
+    // afresh); the old object goes when its last holder releases it.
+    static void ResetInstance();
 
     HRESULT ClearWindows() override;
     HRESULT ForEachWindow(IWindowCallback* callback) override;

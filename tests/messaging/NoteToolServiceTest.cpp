@@ -17,7 +17,7 @@ class NoteToolServiceTest : public AmbrelTest {
 protected:
     void SetUp() override {
         AmbrelTest::SetUp();
-        CNoteToolService::DestroyInstance();
+        CNoteToolService::ResetInstance();
         Platform::SetProcessLauncher(&launcher);
         Platform::SetForeignWindows(&windows);
         SetItemWindowHub(&hub);
@@ -27,7 +27,8 @@ protected:
     void TearDown() override {
         SetItemWindowHub(nullptr);
         Platform::SetForeignWindows(nullptr);
-        CNoteToolService::DestroyInstance();
+        service->Release();
+        CNoteToolService::ResetInstance();
         AmbrelTest::TearDown();
     }
 

@@ -17,7 +17,7 @@ class ViewerServiceTest : public AmbrelTest {
 protected:
     void SetUp() override {
         AmbrelTest::SetUp();
-        CViewerService::DestroyInstance();
+        CViewerService::ResetInstance();
         Platform::SetProcessLauncher(&launcher);
         SetItemWindowHub(&hub);
         service = CViewerService::GetInstance();
@@ -25,7 +25,8 @@ protected:
     }
     void TearDown() override {
         SetItemWindowHub(nullptr);
-        CViewerService::DestroyInstance();
+        service->Release();
+        CViewerService::ResetInstance();
         AmbrelTest::TearDown();
     }
 

@@ -17,8 +17,8 @@ void NavigatorModelFixture::SetUp() {
 void NavigatorModelFixture::TearDown() {
     WNavDS::DestroyInstance();
     NavigatorSettings::DestroyInstance();
-    CNoteToolService::DestroyInstance();
-    CViewerService::DestroyInstance();
+    CNoteToolService::ResetInstance();
+    CViewerService::ResetInstance();
     if (IDataStoreService* current = GetDataStoreService())
         current->Release();
     SetItemWindowHub(nullptr);

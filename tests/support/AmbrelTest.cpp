@@ -6,6 +6,15 @@
 #include "platform/IProcessLauncher.h"
 #include "platform/IWaitCursor.h"
 #include "platform/Registry.h"
+#ifdef AMBREL_WITH_NAVIGATOR
+#include "navigator/WNavDS.h"
+#endif
+#ifdef AMBREL_WITH_MESSAGING
+#include "libs/toolwell/IItemWindowHub.h"
+#include "messaging/CNoteToolService.h"
+#include "messaging/CViewerService.h"
+#include "platform/IForeignWindows.h"
+#endif
 #ifdef AMBREL_WITH_CATALOG
 #include "catalog/IDataStoreService.h"
 #endif
@@ -25,12 +34,21 @@ void ResetSingletons() {
     Platform::SetProcessLauncher(nullptr);
     Platform::Registry::SetMachineFile({});
     SetSnapshotNoteHandler({});
+#ifdef AMBREL_WITH_NAVIGATOR
+    WNavDS::DestroyInstance();
+#endif
 #ifdef AMBREL_WITH_CATALOG
     if (IDataStoreService* service = GetDataStoreService())
         service->Shutdown(0);
 #endif
 #ifdef AMBREL_WITH_SETTINGS
     NavigatorSettings::DestroyInstance();
+#endif
+#ifdef AMBREL_WITH_MESSAGING
+    CNoteToolService::ResetInstance();
+    CViewerService::ResetInstance();
+    SetItemWindowHub(nullptr);
+    Platform::SetForeignWindows(nullptr);
 #endif
 }
 
