@@ -60,6 +60,8 @@ bool CNavigatorApp::InitInstance() {
     m_dataStoreHost.reset(GetDataStoreHost());
     if (!m_dataStoreHost)
         return false;
+    // Without a catalog the navigator still starts; it just has nothing to show.
+    m_dataStoreService = CreateDataStoreService(m_dataStoreHost.get());
     settings->SetDataStoreHost(m_dataStoreHost.get());
 
     m_mainWindow = new WMainFrame;
@@ -107,6 +109,10 @@ int CNavigatorApp::ExitInstance() {
     m_terminationSignals.reset();
     if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->IsDirty())
         settings->Save();
+    if (m_dataStoreService != nullptr) {
+        m_dataStoreService->Shutdown(1);
+        m_dataStoreService = nullptr;
+    }
     m_dataStoreHost.reset();
     ReleaseHarborUtilsInterface();
     m_applicationInfo.reset();

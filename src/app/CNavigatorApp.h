@@ -1,6 +1,7 @@
 #pragma once
 
 #include "app/ApplicationInfo.h"
+#include "catalog/IDataStoreService.h"
 #include "common/ReleasePtr.h"
 #include "libs/toolwell/IDataStoreHost.h"
 #include "ui/WMainFrame.h"
@@ -37,6 +38,7 @@ private:
 
     ReleasePtr<Brindle::Application::IApplicationInfo> m_applicationInfo;
     ReleasePtr<IDataStoreHost> m_dataStoreHost;
+    IDataStoreService* m_dataStoreService = nullptr; // ended with Shutdown(1), which saves
     QPointer<WMainFrame> m_mainWindow;
     std::unique_ptr<IdlePass> m_idlePass;
     std::unique_ptr<TerminationSignals> m_terminationSignals;

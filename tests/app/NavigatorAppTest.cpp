@@ -129,4 +129,30 @@ TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
     EXPECT_TRUE(ReadSettings().contains(QStringLiteral("|keepontop|true|")));
 }
 
+TEST_F(NavigatorAppTest, AFreshStartMakesTheCatalogAndABrokenOneIsLeftAlone) {
+    const QString catalog = AppDataFolder() + QStringLiteral("/Catalog/catalog.xml");
+    {
+        CNavigatorApp app;
+        ASSERT_TRUE(app.InitInstance());
+        delete app.MainWindow();
+        app.ExitInstance();
+    }
+    QFile made(catalog);
+    ASSERT_TRUE(made.open(QIODevice::ReadOnly));
+    EXPECT_TRUE(made.readAll().startsWith("\xFF\xFE<\0?\0x\0m\0l\0"));
+
+    const QByteArray broken = "<?xml version=\"1.0\"?><archive><items><item uuid=\"root\"";
+    WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"), broken);
+    {
+        CNavigatorApp app;
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        delete app.MainWindow();
+        app.ExitInstance();
+    }
+    QFile kept(catalog);
+    ASSERT_TRUE(kept.open(QIODevice::ReadOnly));
+    EXPECT_EQ(kept.readAll(), broken);
+}
+
 } // namespace
