@@ -17,7 +17,8 @@ class QLocalSocket;
 // On the wire a message is a 4-byte big-endian length and that many bytes of UTF-8 text; the
 // answer is one byte, sent after the handler has returned. Connections of other users, texts
 // over the size limit, text that is not valid UTF-8 or holds a NUL, extra bytes and peers that
-// stall are dropped without ever waiting on them.
+// stall are dropped without ever waiting on them. A message whose sender stopped waiting before
+// its turn came is not handled: that start has already reported that nothing happened.
 class SharedMemory final : public QObject {
     Q_OBJECT
 public:

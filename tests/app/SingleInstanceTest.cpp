@@ -7,6 +7,7 @@
 
 #include <QDir>
 #include <QFile>
+#include <QThread>
 
 #include <atomic>
 #include <future>
@@ -18,19 +19,28 @@ using Outcome = SingleInstance::Outcome;
 
 const QString kName = QStringLiteral("AmbrelNavigator-1.0.0.521-:0-me");
 
+// Runs a start in a thread of its own, as it would run in a process of its own.
+template <class Start> auto InOwnThread(Start start) {
+    auto promise = std::make_shared<std::promise<decltype(start())>>();
+    auto future = promise->get_future();
+    QThread* thread = QThread::create([promise, start] { promise->set_value(start()); });
+    QObject::connect(thread, &QThread::finished, thread, &QObject::deleteLater);
+    thread->start();
+    return future;
+}
+
 class SingleInstanceTest : public AmbrelTest {
 protected:
     QString SocketPath() const { return RuntimeHome() + u'/' + kName; }
     QString LockPath() const { return SocketPath() + QStringLiteral("-StartupMutex"); }
 
-    // A later start, in a thread of its own as it would be in a process of its own, while
-    // this thread runs the event loop of the navigator under test.
+    // A later start while this thread runs the event loop of the navigator under test.
     struct LaterStart {
         Outcome outcome;
         bool handledBeforeItEnded;
     };
     LaterStart StartAnother(const QStringList& arguments, std::chrono::milliseconds patience) {
-        auto later = std::async(std::launch::async, [=, this] {
+        auto later = InOwnThread([=, this] {
             SingleInstance instance(kName);
             const Outcome outcome = instance.Start(arguments, patience);
             return LaterStart{outcome, m_handlerReturned.load()};
@@ -146,6 +156,27 @@ TEST_F(SingleInstanceTest, AWithdrawnNavigatorMakesLaterStartsWaitUntilItIsGone)
     EXPECT_EQ(later.Start({QStringLiteral("prog"), QStringLiteral("/NewNote")}, 200ms),
               Outcome::Running);
     EXPECT_TRUE(m_actions.calls.isEmpty());
+}
+
+TEST_F(SingleInstanceTest, AStartWaitingOnANavigatorThatShutsDownBecomesTheNavigatorAfterIt) {
+    auto running = std::make_unique<SingleInstance>(kName);
+    ASSERT_EQ(running->Start({QStringLiteral("prog")}), Outcome::Running);
+    // Not answering yet, so the later start is still waiting when the shut-down begins.
+    running->EndStartup();
+    auto later = InOwnThread([] {
+        SingleInstance instance(kName);
+        return instance.Start({QStringLiteral("prog"), QStringLiteral("/NewNote")});
+    });
+    SpinFor(300);
+
+    running->Withdraw();
+    EXPECT_TRUE(running->HoldsLock());
+    SpinFor(300);
+    EXPECT_EQ(later.wait_for(0s), std::future_status::timeout);
+
+    running.reset();
+    ASSERT_TRUE(SpinUntil([&] { return later.wait_for(0s) == std::future_status::ready; }));
+    EXPECT_EQ(later.get(), Outcome::Running);
 }
 
 TEST_F(SingleInstanceTest, ACommandLineThatCannotTravelIsNotHandedOver) {
