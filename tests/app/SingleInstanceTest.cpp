@@ -5,7 +5,6 @@
 #include "app/ForwardedCommandLine.h"
 #include "app/SingleInstance.h"
 
-#include <QDir>
 #include <QFile>
 #include <QThread>
 
@@ -66,8 +65,6 @@ TEST(InstanceNameTest, NamesVersionDesktopAndUserWhereKnown) {
               QStringLiteral("AmbrelNavigator-1.0.0.521-:0-me"));
     EXPECT_EQ(SingleInstance::InstanceName(QString(), QStringLiteral("me")),
               QStringLiteral("AmbrelNavigator-1.0.0.521-me"));
-    EXPECT_EQ(SingleInstance::InstanceName(QStringLiteral("wayland-0"), QString()),
-              QStringLiteral("AmbrelNavigator-1.0.0.521-wayland-0"));
     EXPECT_EQ(SingleInstance::InstanceName(QString(), QString()),
               QStringLiteral("AmbrelNavigator-1.0.0.521"));
     // A display given as a path must not turn the name into a path.
@@ -113,18 +110,6 @@ TEST_F(SingleInstanceTest, NoAnswerBeforeTheNavigatorIsPublishedAndNothingRunsLa
               Outcome::HandedOver);
     // The start that gave up said so; its note must not appear behind its back.
     EXPECT_EQ(m_actions.calls, QStringList{QStringLiteral("OpenDocument")});
-}
-
-TEST_F(SingleInstanceTest, NoAnswerWhileAStartHoldsTheLockWithoutListening) {
-    StartupMutex hung;
-    ASSERT_TRUE(hung.Create(kName));
-    ASSERT_TRUE(hung.Wait());
-    SingleInstance later(kName);
-    EXPECT_EQ(later.Start({QStringLiteral("prog")}, 200ms), Outcome::NoAnswer);
-    EXPECT_FALSE(QFile::exists(SocketPath()));
-
-    hung.Release();
-    EXPECT_EQ(later.Start({QStringLiteral("prog")}, 200ms), Outcome::Running);
 }
 
 TEST_F(SingleInstanceTest, ANavigatorThatWasKilledIsReplaced) {
@@ -198,22 +183,6 @@ TEST_F(SingleInstanceTest, ACommandLineThatCannotTravelIsNotHandedOver) {
     // With no navigator running such a command line is simply this start's own.
     SingleInstance alone(QStringLiteral("AmbrelNavigator-other"));
     EXPECT_EQ(alone.Start({QStringLiteral("prog"), huge}), Outcome::Running);
-}
-
-TEST_F(SingleInstanceTest, NoPrivateRuntimeFolderMeansNoNavigator) {
-    const auto open =
-        QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner | QFile::ReadOther | QFile::ExeOther;
-    QFile::setPermissions(RuntimeHome(), open);
-    const QString fallback =
-        RuntimeHome() + QStringLiteral("/ambrel-runtime-") + QString::number(::geteuid());
-    ASSERT_TRUE(QDir().mkpath(fallback));
-    QFile::setPermissions(fallback, open);
-    const QByteArray savedTmp = qgetenv("TMPDIR");
-    qputenv("TMPDIR", QFile::encodeName(RuntimeHome()));
-    SingleInstance instance(kName);
-    EXPECT_EQ(instance.Start({QStringLiteral("prog")}, 200ms), Outcome::Unavailable);
-    EXPECT_FALSE(instance.HoldsLock());
-    qputenv("TMPDIR", savedTmp);
 }
 
 } // namespace

@@ -41,10 +41,6 @@ constexpr QFile::Permissions kOthers = QFile::ReadGroup | QFile::WriteGroup | QF
 constexpr QFile::Permissions kOpen =
     kPrivate | QFile::ReadGroup | QFile::ExeGroup | QFile::ReadOther | QFile::ExeOther;
 
-TEST_F(RuntimeFolderTest, UsesAPrivateRuntimeFolder) {
-    EXPECT_EQ(Platform::RuntimeFolder(), RuntimeHome());
-}
-
 TEST_F(RuntimeFolderTest, PassesOverALinkedOrOpenFolderForAPrivateOneOfItsOwn) {
     const QString target = Home() + QStringLiteral("/elsewhere");
     ASSERT_TRUE(QDir().mkpath(target));

@@ -128,18 +128,6 @@ TEST_F(SharedMemoryTest, SocketPathsTooLongForTheSystemAreRefused) {
     const QString longer = kName + u'x';
     EXPECT_TRUE(SharedMemory::SocketPath(longer).isEmpty());
     EXPECT_FALSE(m_channel.Listen(longer));
-    SharedMemoryClient client;
-    EXPECT_EQ(client.Connect(longer, QDeadlineTimer(5000)),
-              SharedMemoryClient::Connection::Unavailable);
-}
-
-TEST_F(SharedMemoryTest, TextOverTheLimitIsNotSent) {
-    ListenAndPublish();
-    SharedMemoryClient client;
-    ASSERT_EQ(client.Connect(kName, QDeadlineTimer(5000)),
-              SharedMemoryClient::Connection::Connected);
-    const QString tooLong(SharedMemory::kMaximumMessageBytes / 2 + 1, QChar(0x00fc));
-    EXPECT_EQ(client.Exchange(tooLong, QDeadlineTimer(5000)), SharedMemoryClient::Answer::TooLarge);
 }
 
 // Only root can become another user; the runtime folder is opened to others for the occasion

@@ -45,11 +45,4 @@ TEST_F(StartupMutexTest, ALockLeftByADeadStartIsTakenOver) {
     EXPECT_TRUE(mutex.Wait(milliseconds(0)));
 }
 
-TEST_F(StartupMutexTest, RefusesNamesThatAreNotOneFileName) {
-    StartupMutex mutex;
-    for (const QString& name : {QString(), QStringLiteral(".."), QStringLiteral("a/b")})
-        EXPECT_FALSE(mutex.Create(name)) << name.toStdString();
-    EXPECT_FALSE(mutex.Wait(milliseconds(0)));
-}
-
 } // namespace
