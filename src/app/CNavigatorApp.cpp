@@ -2,6 +2,7 @@
 
 #include "app/IdlePass.h"
 #include "libs/toolwell/IHarborUtils.h"
+#include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 #include "ui/QtMessageBox.h"
 #include "ui/QtWaitCursor.h"
@@ -62,6 +63,9 @@ bool CNavigatorApp::InitInstance() {
         return false;
     // Without a catalog the navigator still starts; it just has nothing to show.
     m_dataStoreService = CreateDataStoreService(m_dataStoreHost.get());
+    WNavDS* navigator = WNavDS::Instance();
+    navigator->SetDataStoreHost(m_dataStoreHost.get());
+    navigator->Initialize();
     settings->SetDataStoreHost(m_dataStoreHost.get());
 
     m_mainWindow = new WMainFrame;
@@ -97,10 +101,13 @@ void CNavigatorApp::PlaceMainWindow() {
 }
 
 bool CNavigatorApp::OnIdle(int count) {
+    if (WNavDS::Instance()->IsChanged() && m_dataStoreService != nullptr)
+        m_dataStoreService->Save();
     if (!m_mainWindow) {
         QCoreApplication::exit(0);
         return false;
     }
+    m_mainWindow->OnIdleWork();
     NavigatorSettings::Instance()->SaveIfDirty();
     return count < 1;
 }
@@ -109,6 +116,7 @@ int CNavigatorApp::ExitInstance() {
     m_terminationSignals.reset();
     if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->IsDirty())
         settings->Save();
+    WNavDS::DestroyInstance();
     if (m_dataStoreService != nullptr) {
         m_dataStoreService->Shutdown(1);
         m_dataStoreService = nullptr;

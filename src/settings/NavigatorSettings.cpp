@@ -6,6 +6,8 @@
 #include "dataexchange/WProperties.h"
 #include "libs/toolwell/Formats.h"
 #include "libs/toolwell/IHarborUtils.h"
+#include "messaging/CNoteToolService.h"
+#include "messaging/CViewerService.h"
 #include "platform/AppFolders.h"
 #include "platform/ScreenMetrics.h"
 #include "settings/ISettingsWindow.h"
@@ -100,7 +102,15 @@ bool MessageCentreAvailable() {
 NavigatorSettings* NavigatorSettings::Instance() {
     if (!g_instance)
         g_instance.reset(new NavigatorSettings);
+    g_instance->FillServices();
     return g_instance.get();
+}
+
+void NavigatorSettings::FillServices() {
+    if (m_viewerService == nullptr)
+        m_viewerService = CViewerService::GetInstance();
+    if (m_noteToolService == nullptr)
+        m_noteToolService = CNoteToolService::GetInstance();
 }
 
 void NavigatorSettings::DestroyInstance() {
@@ -113,6 +123,10 @@ NavigatorSettings::NavigatorSettings()
           QStringLiteral("Times New Roman"), QStringLiteral("255,255,255"), QString())) {}
 
 NavigatorSettings::~NavigatorSettings() {
+    if (m_viewerService != nullptr)
+        m_viewerService->Release();
+    if (m_noteToolService != nullptr)
+        m_noteToolService->Release();
     m_record.reset();
     if (m_dataStoreHost != nullptr)
         m_dataStoreHost->Release();

@@ -11,6 +11,8 @@
 #include <memory>
 
 class ISettingsWindow;
+class INoteToolService;
+class IViewerService;
 
 // The navigator's options, one object per process, kept in "NavSettings.dat" in the
 // application data folder: the pipe-delimited property text in UTF-16 little-endian, without
@@ -52,6 +54,10 @@ public:
     IDataStoreHost* GetDataStoreHost() const { return m_dataStoreHost; }
     void SetApplicationInfo(Brindle::Application::IApplicationInfo* info);
     Brindle::Application::IApplicationInfo* GetApplicationInfo() const { return m_applicationInfo; }
+
+    // The viewer and note tool services, through which the program's windows are reached.
+    IViewerService* GetViewerService() const { return m_viewerService; }
+    INoteToolService* GetNoteToolService() const { return m_noteToolService; }
 
     // Called after a filter option changed, so that the tree can be refilled.
     void SetFilterChangedHandler(std::function<void()> handler) {
@@ -110,6 +116,7 @@ private:
 
     void ChooseTypeFilter(Settings::Bool NavigatorSettingsRecord::*filter, bool show);
     void FilterChanged();
+    void FillServices();
 
     std::unique_ptr<NavigatorSettingsRecord> m_record;
     bool m_dirty = false;
@@ -120,4 +127,6 @@ private:
     IDataStoreHost* m_dataStoreHost = nullptr;
     Brindle::Application::IApplicationInfo* m_applicationInfo = nullptr;
     std::function<void()> m_filterChanged;
+    IViewerService* m_viewerService = nullptr;
+    INoteToolService* m_noteToolService = nullptr;
 };

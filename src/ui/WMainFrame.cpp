@@ -1,5 +1,6 @@
 #include "ui/WMainFrame.h"
 
+#include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 
 WMainFrame::WMainFrame(QWidget* parent) : QMainWindow(parent) {
@@ -29,6 +30,12 @@ void WMainFrame::ShowFrame(bool show) {
     setWindowFlag(Qt::FramelessWindowHint, !show);
     if (visible)
         this->show();
+}
+
+void WMainFrame::OnIdleWork() {
+    // The frame shows no tree of its own yet, so there is nothing to rebuild from the model;
+    // the change has reached the catalog.
+    WNavDS::Instance()->SetChanged(false);
 }
 
 // There is no message centre bar on this platform yet; the option is kept for when it comes.

@@ -13,6 +13,8 @@ public:
     ~WMainFrame() override;
 
     void SetTrackPosition(bool track) { m_trackPosition = track; }
+    // The frame's share of the idle pass, after the catalog has been saved.
+    void OnIdleWork();
 
     void SetKeepOnTop(bool onTop) override;
     void ShowFrame(bool show) override;
