@@ -6,7 +6,10 @@
 #include <QHash>
 #include <QList>
 #include <QString>
+#include <QStringList>
 
+#include <chrono>
+#include <functional>
 #include <list>
 #include <memory>
 
@@ -152,4 +155,39 @@ private:
     INoteToolService* m_noteToolService = nullptr;
     IViewerService* m_viewerService = nullptr;
     IDataStoreHost* m_dataStoreHost = nullptr;
-};
+
+    // Opening, closing and sending
+public:
+    // A folder toggles its expansion (kept in the catalog). A note or document whose file is
+    // missing is reported and left as it is; otherwise it is opened when closed, and its
+    // window is restored and, with activate, brought to the front.
+    void OpenItem(NavListItemData* item, bool activate);
+    void OpenSelected();
+    // Opens every note and document below the folder, selecting each; linked documents and
+    // deleted items are left alone.
+    void OpenAllInFolder(const QString& folderId);
+    // Then opens the selection as it stands: the last item opened, or the folder itself when
+    // nothing was (which toggles it).
+    void OpenAllInSelectedFolder();
+    // Selects and opens the item; an id the notebook does not show is dropped from the
+    // recently used lists.
+    void OpenById(const QString& itemId);
+    void ActivateById(const QString& itemId);
+    void CloseSelected();
+    // Closes the item and everything below it.
+    void CloseTree(const QString& itemId);
+    void CloseAllInFolder(const QString& folderId);
+    void CloseAllInSelectedFolder();
+    void CloseAllOpenNotes();
+    void CloseAllOpenDocuments();
+    void PrintSelected();
+    void SendSelectedToWordProcessor();
+    // Hands the item to the word processor that `target` names (a folder as its notes); a
+    // refusal is shown to the user. Answers the bridge's result.
+    HRESULT SendItemTo(const QString& itemId, const QString& target);
+    // The note files below the folder that the filter shows, depth-first in catalog order,
+    // deleted notes left out.
+    void CollectNotePaths(const QString& folderId, QStringList* list);
+    void SendSelectedNoteToBlog();
+    // How long shut-down waits for each program's windows to close.
+    static constexpr std::chrono::milliseconds kWindowCloseWait{8000};
