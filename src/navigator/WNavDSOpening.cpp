@@ -103,7 +103,8 @@ void WNavDS::OpenItem(NavListItemData* item, bool activate) {
         UpdateItem(item->GetItemId(), set.get(), true);
         return;
     }
-    if (GetDataStoreService() == nullptr)
+    if ((item->GetKind() != ItemKindNote && item->GetKind() != ItemKindDocument) ||
+        GetDataStoreService() == nullptr)
         return;
 
     const QString itemId = item->GetItemId();
@@ -350,22 +351,24 @@ void WNavDS::CloseAllWindowsAndWait(std::chrono::milliseconds wait) {
     m_noteToolService->ForEachWindow(&closeAll);
     m_viewerService->ForEachWindow(&closeAll);
 
+    // Copies: commands run during the wait, and nothing here may depend on this object then.
     INoteToolService* noteTool = m_noteToolService;
     IViewerService* viewer = m_viewerService;
+    const std::function<void()> idlePass = m_idlePassHook;
     WaitForWindows(
         [noteTool] {
             int count = 0;
             noteTool->GetWindowCount(&count);
             return count;
         },
-        wait, m_idlePassHook);
+        wait, idlePass);
     WaitForWindows(
         [viewer] {
             int count = 0;
             viewer->GetWindowCount(&count);
             return count;
         },
-        wait, m_idlePassHook);
+        wait, idlePass);
 }
 
 void WNavDS::OpenNewDocumentInViewer() {

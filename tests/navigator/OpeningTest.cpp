@@ -1,7 +1,6 @@
 #include "NavigatorModelFixture.h"
 
 #include "libs/toolwell/IItemLink.h"
-#include "libs/toolwell/ItemIdentifier.h"
 #include "libs/toolwell/WordProcessor.h"
 #include "messaging/INoteToolService.h"
 #include "messaging/IViewerService.h"
@@ -366,20 +365,6 @@ TEST_F(OpeningTest, WaitingForWindowsGivesUpOnOneThatNeverCloses) {
     EXPECT_EQ(count, 0);
     viewer->GetWindowCount(&count);
     EXPECT_EQ(count, 1);
-}
-
-TEST_F(OpeningTest, ANewViewerDocumentGetsAFreshIdentifier) {
-    WNavDS* model = Load();
-    model->OpenNewDocumentInViewer();
-    model->OpenNewDocumentInViewer();
-    ASSERT_EQ(launcher.starts.size(), 2);
-    const QStringList first = launcher.starts[0].arguments;
-    ASSERT_EQ(first.size(), 1);
-    ASSERT_TRUE(first[0].startsWith(QStringLiteral("/id:")));
-    const QString id = first[0].mid(4);
-    EXPECT_TRUE(IsItemIdentifier(id));
-    EXPECT_EQ(id, id.toUpper());
-    EXPECT_NE(launcher.starts[1].arguments, first);
 }
 
 } // namespace
