@@ -1,5 +1,6 @@
 #pragma once
 
+#include "common/IUnicodeString.h"
 #include "messaging/IWindowEventNotification.h"
 #include "navigator/NavListItemData.h"
 
@@ -156,6 +157,71 @@ private:
     IViewerService* m_viewerService = nullptr;
     IDataStoreHost* m_dataStoreHost = nullptr;
 
+    // Item operations
+public:
+    // Adds a note, folder or document that the set describes. placement 0: at the selection,
+    // documents to Linked Documents and nothing into Deleted Items; 2: at the drop target; any
+    // other: at the selection as it is. A document the catalog already holds is used again.
+    // The new item becomes the selection; its identifier goes to idSink. E_FAIL without a
+    // catalog or when nothing was made.
+    HRESULT AddNewItem(DataExchange::IProperties* properties, int placement,
+                       IUnicodeString* idSink);
+    // AddNewItem, then Linked Documents is kept within its limit.
+    HRESULT AddNewItemAndLimit(DataExchange::IProperties* properties, int placement,
+                               IUnicodeString* idSink);
+    // A note with the default look, at the selection, opened in the note tool at once. The
+    // given set (or a new one) receives the note's properties and stays the caller's.
+    void NewNote(DataExchange::IProperties* properties, IUnicodeString* idSink);
+    // A folder named "New Folder" at the selection, its name then opened for editing.
+    void NewFolder(IUnicodeString* idSink);
+    // Finds or adds the linked document for the file and opens it; other file types than
+    // qmd, doc and pdf are ignored.
+    void LinkDocument(const QString& path, bool activate);
+    // Moves the item onto a folder (as its last child) or before another item; into and out
+    // of Deleted Items it is deleted or restored. Without a target it goes to the end of the
+    // Notebook. A linked document that leaves Linked Documents is copied into the notebook.
+    void MoveItemTo(NavListItemData* item, NavListItemData* target);
+    void MoveSelectedTo(NavListItemData* target);
+    void MoveById(const QString& itemId);
+    // Into Deleted Items; an item already there is removed for good, and Deleted Items itself
+    // is emptied.
+    void DeleteSelected();
+    // Back to where the item was deleted from; on Deleted Items itself, everything comes back.
+    void RestoreSelected();
+    void EmptyDeletedItems();
+    void RestoreAllDeleted();
+    // Marks the item deleted ("true") or not ("false") in the catalog; deleting closes it and
+    // everything below it. The record is not moved here.
+    void SetDeleted(NavListItemData* item, const QString& value);
+    // The file of the selected document (a linked one's own path); false when nothing, or no
+    // document, is selected or no path can be made.
+    bool GetSelectedDocumentPath(QString* path);
+
+    // The tree's type filter: exactly one is chosen; "opened items only" is independent.
+    enum class TypeFilter { Notes, Qmd, Doc, Pdf, All };
+    void ChooseTypeFilter(TypeFilter filter);
+    bool IsTypeFilterChosen(TypeFilter filter) const;
+    void ToggleOpenedItemsOnly();
+    bool IsOpenedItemsOnly() const;
+
+    // When the item commands are enabled, besides CanEditSelected (Delete),
+    // IsSelectedInDeletedItems (Restore), IsSelectedOpen (Close) and IsLinkedDocumentSelected
+    // (Save to Notebook).
+    bool CanRenameSelected() const;
+    // Print and the document menu's word-processor command; mail also needs the mail service.
+    bool CanPrintSelected() const;
+    bool CanSendSelectedToWordProcessor() const;
+    bool CanBlogSelected() const;
+
+private:
+    void ForgetInItemLink(const NavListItemData* item);
+    // Moves the record, with the records below it, before `before` in the list (to the end
+    // for null).
+    void MoveRecordBefore(NavListItemData* item, NavListItemData* before);
+    // A linked document that left Linked Documents: its file is copied into its item folder
+    // and it becomes part of the notebook, or, without a copy, it goes back to Linked Documents.
+    void JoinNotebook(NavListItemData* item);
+
     // Opening, closing and sending
 public:
     // A folder toggles its expansion (kept in the catalog). A note or document whose file is
@@ -191,3 +257,19 @@ public:
     void SendSelectedNoteToBlog();
     // How long shut-down waits for each program's windows to close.
     static constexpr std::chrono::milliseconds kWindowCloseWait{8000};
+    // Asks every note tool and viewer window to close and waits for them, up to `wait` for
+    // each program, keeping messages and the idle pass going.
+    void CloseAllWindowsAndWait(std::chrono::milliseconds wait = kWindowCloseWait);
+    // One idle pass of the application, run while CloseAllWindowsAndWait waits.
+    void SetIdlePassHook(std::function<void()> hook);
+    // Starts a viewer without a file under a new identifier.
+    void OpenNewDocumentInViewer();
+    void NewWordProcessorDocument();
+
+private:
+    void CloseAllOpen(ItemKind kind);
+    // The note's file as the note tool knows it; empty when none can be made.
+    QString NoteFilePath(const QString& itemId) const;
+
+    std::function<void()> m_idlePassHook;
+};
