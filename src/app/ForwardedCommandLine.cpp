@@ -2,6 +2,9 @@
 
 #include "app/CNavigatorCmdLineInfo.h"
 
+#include <QDir>
+#include <QFileInfo>
+
 #include <algorithm>
 
 namespace {
@@ -58,4 +61,17 @@ void RunForwardedCommandLine(const QString& text, IStartActions& actions) {
     CNavigatorCmdLineInfo info;
     ParseCommandLine(info, SplitForwardedCommandLine(text));
     RunStartActions(info, actions);
+}
+
+QStringList MakeFileArgumentsAbsolute(const QStringList& arguments) {
+    QStringList result = arguments;
+    for (qsizetype i = 1; i < result.size(); ++i) {
+        const QString& argument = result.at(i);
+        if (argument.isEmpty() || IsSwitchToken(argument) || QFileInfo(argument).isAbsolute())
+            continue;
+        const QFileInfo file(QDir::current(), argument);
+        if (file.exists())
+            result[i] = file.absoluteFilePath();
+    }
+    return result;
 }

@@ -2,6 +2,9 @@
 #include "app/ForwardedCommandLine.h"
 
 #include "RecordingStartActions.h"
+#include "support/AmbrelTest.h"
+
+#include <QDir>
 
 #include <gtest/gtest.h>
 
@@ -172,6 +175,25 @@ TEST(ForwardedCommandLineTest, JoinedArgumentsSplitBackUnchanged) {
 
     EXPECT_TRUE(
         JoinForwardedCommandLine({QStringLiteral("prog"), QStringLiteral("say \"hi\"")}).isNull());
+}
+
+} // namespace
+
+namespace {
+
+class FileArgumentsTest : public AmbrelTest {};
+
+TEST_F(FileArgumentsTest, RelativeFileArgumentsAreMadeAbsoluteForTheRunningNavigator) {
+    const QString file = WriteFile(QStringLiteral("work/my note.txt"), "text");
+    const QString saved = QDir::currentPath();
+    ASSERT_TRUE(QDir::setCurrent(Home() + QStringLiteral("/work")));
+    const QStringList made = MakeFileArgumentsAbsolute(
+        {QStringLiteral("prog"), QStringLiteral("/NewNoteFromFile"), QStringLiteral("my note.txt"),
+         QStringLiteral("/OpenMRUItem"), QStringLiteral("not-a-file"), QStringLiteral("/etc")});
+    QDir::setCurrent(saved);
+    EXPECT_EQ(made, (QStringList{QStringLiteral("prog"), QStringLiteral("/NewNoteFromFile"), file,
+                                 QStringLiteral("/OpenMRUItem"), QStringLiteral("not-a-file"),
+                                 QStringLiteral("/etc")}));
 }
 
 } // namespace
