@@ -27,6 +27,8 @@ class IProperties;
 // catalog, keeps the selection and the drop target, and writes every change to the catalog
 // before it changes a record. Nothing is pushed to the tree: it polls the change flag at idle
 // time and rebuilds itself from the records.
+class CBasicNoteConstructor;
+
 class WNavDS final : public IWindowEventNotification {
 public:
     // Every record in list order: the three special folders first, then the catalog's items
@@ -221,6 +223,18 @@ private:
     // A linked document that left Linked Documents: its file is copied into its item folder
     // and it becomes part of the notebook, or, without a copy, it goes back to Linked Documents.
     void JoinNotebook(NavListItemData* item);
+
+    // Notes made from files
+public:
+    // A note built by the constructor, titled `title` (the default title when empty), placed
+    // as AddNewItem places it and opened in the note tool when open is 1. When the constructor
+    // cannot make the note file the new item goes again and the selection is put back. S_OK
+    // or E_FAIL.
+    HRESULT AddNoteFromConstructor(const QString& title, CBasicNoteConstructor* constructor,
+                                   int open, int placement, IUnicodeString* idCallback);
+    // A note made from the file, at the selection and opened. The file is removed once the
+    // note was made, and kept otherwise. E_FAIL when no constructor takes the file.
+    HRESULT AddNoteFromFile(const QString& source, IUnicodeString* idCallback);
 
     // Opening, closing and sending
 public:
