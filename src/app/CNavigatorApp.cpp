@@ -1,7 +1,9 @@
 #include "app/CNavigatorApp.h"
 
+#include "app/ForwardedCommandLine.h"
 #include "app/IdlePass.h"
 #include "libs/toolwell/IHarborUtils.h"
+#include "libs/toolwell/ISnapshotService.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 #include "ui/QtMessageBox.h"
@@ -10,6 +12,8 @@
 #include "ui/WMainFrame.h"
 
 #include <QApplication>
+
+#include <cstdio>
 
 namespace {
 
@@ -21,7 +25,7 @@ QtWaitCursor g_waitCursor;
 
 } // namespace
 
-CNavigatorApp::CNavigatorApp() = default;
+CNavigatorApp::CNavigatorApp(QStringList arguments) : m_arguments(std::move(arguments)) {}
 
 CNavigatorApp::~CNavigatorApp() {
     Platform::SetMessageBox(nullptr);
@@ -42,8 +46,30 @@ int CNavigatorApp::Run() {
 }
 
 bool CNavigatorApp::InitInstance() {
+    const bool started = StartUp();
+    // The start-up lock is held from the single-instance check to here, whatever the outcome.
+    if (m_singleInstance)
+        m_singleInstance->EndStartup();
+    return started;
+}
+
+bool CNavigatorApp::StartUp() {
     Platform::SetMessageBox(&g_messageBox);
     Platform::SetWaitCursor(&g_waitCursor);
+
+    const QStringList arguments = MakeFileArgumentsAbsolute(m_arguments);
+    m_singleInstance = std::make_unique<SingleInstance>();
+    const SingleInstance::Outcome outcome = m_singleInstance->Start(arguments);
+    if (outcome != SingleInstance::Outcome::Running) {
+        // A second start ends here: the running navigator has had its command line, or could
+        // not be reached, which the user who typed it must hear about.
+        if (outcome != SingleInstance::Outcome::HandedOver) {
+            std::fputs(qPrintable(SingleInstance::Describe(outcome) + u'\n'), stderr);
+            m_exitCode = 1;
+        }
+        return false;
+    }
+    ParseCommandLine(m_commandLineInfo, arguments);
 
     m_applicationInfo.reset(CreateApplicationInfo());
     if (!m_applicationInfo)
@@ -57,6 +83,10 @@ bool CNavigatorApp::InitInstance() {
     if (utils == nullptr || !utils->IsReady() || !utils->IsEnabled())
         return false;
     utils->SetShuttingDown(false);
+    if (m_commandLineInfo.Qmo()) {
+        utils->RunQmoStartAction();
+        m_commandLineInfo.ClearQmo();
+    }
 
     m_dataStoreHost.reset(GetDataStoreHost());
     if (!m_dataStoreHost)
@@ -67,11 +97,22 @@ bool CNavigatorApp::InitInstance() {
     navigator->SetDataStoreHost(m_dataStoreHost.get());
     navigator->Initialize();
     settings->SetDataStoreHost(m_dataStoreHost.get());
+    SetSnapshotNoteHandler(
+        [](const QString& path) { return WNavDS::Instance()->AddNoteFromFile(path, nullptr); });
 
     m_mainWindow = new WMainFrame;
     m_mainWindow->setAttribute(Qt::WA_DeleteOnClose);
     PlaceMainWindow();
     m_mainWindow->show();
+
+    m_singleInstance->Publish([this](const QString& commandLine) {
+        if (m_mainWindow) {
+            m_mainWindow->showNormal();
+            m_mainWindow->raise();
+            m_mainWindow->activateWindow();
+        }
+        RunForwardedCommandLine(commandLine, m_startActions);
+    });
 
     m_mainWindow->SetTrackPosition(true);
     settings->SetFrame(m_mainWindow);
@@ -109,13 +150,24 @@ bool CNavigatorApp::OnIdle(int count) {
     }
     m_mainWindow->OnIdleWork();
     NavigatorSettings::Instance()->SaveIfDirty();
+    // The idle pass only runs once the queue is empty, so the window has been shown and
+    // painted before the start actions run; running them clears them.
+    RunStartActions(m_commandLineInfo, m_startActions);
     return count < 1;
 }
 
 int CNavigatorApp::ExitInstance() {
+    // A start from now on waits for this navigator to end instead of handing its command line
+    // to one that is going away.
+    if (m_singleInstance)
+        m_singleInstance->Withdraw();
     m_terminationSignals.reset();
-    if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->IsDirty())
+    NavigatorSettings* settings = NavigatorSettings::Instance();
+    if (settings->GetCleanDeletedOnClose())
+        WNavDS::Instance()->EmptyDeletedItems();
+    if (settings->IsDirty())
         settings->Save();
+    SetSnapshotNoteHandler({});
     WNavDS::DestroyInstance();
     if (m_dataStoreService != nullptr) {
         m_dataStoreService->Shutdown(1);
@@ -124,5 +176,6 @@ int CNavigatorApp::ExitInstance() {
     m_dataStoreHost.reset();
     ReleaseHarborUtilsInterface();
     m_applicationInfo.reset();
+    m_singleInstance.reset();
     return m_exitCode;
 }

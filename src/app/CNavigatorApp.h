@@ -1,13 +1,18 @@
 #pragma once
 
 #include "app/ApplicationInfo.h"
+#include "app/CNavigatorCmdLineInfo.h"
+#include "app/CNavigatorStartActions.h"
+#include "app/SingleInstance.h"
 #include "catalog/IDataStoreService.h"
 #include "common/ReleasePtr.h"
 #include "libs/toolwell/IDataStoreHost.h"
 #include "ui/WMainFrame.h"
 
+#include <QCoreApplication>
 #include <QObject>
 #include <QPointer>
+#include <QStringList>
 
 #include <memory>
 
@@ -18,7 +23,8 @@ class TerminationSignals;
 class CNavigatorApp final : public QObject {
     Q_OBJECT
 public:
-    CNavigatorApp();
+    // arguments: the command line, the program first.
+    explicit CNavigatorApp(QStringList arguments = QCoreApplication::arguments());
     ~CNavigatorApp() override;
 
     // Starts up, runs the event loop and shuts down; answers the process exit code.
@@ -34,8 +40,13 @@ public:
     }
 
 private:
+    bool StartUp();
     void PlaceMainWindow();
 
+    QStringList m_arguments;
+    std::unique_ptr<SingleInstance> m_singleInstance;
+    CNavigatorCmdLineInfo m_commandLineInfo;
+    CNavigatorStartActions m_startActions;
     ReleasePtr<Brindle::Application::IApplicationInfo> m_applicationInfo;
     ReleasePtr<IDataStoreHost> m_dataStoreHost;
     IDataStoreService* m_dataStoreService = nullptr; // ended with Shutdown(1), which saves

@@ -1,5 +1,8 @@
 #include "NavigatorProcess.h"
 
+#include <QDateTime>
+#include <QDeadlineTimer>
+#include <QFileInfo>
 #include <QThread>
 
 #include <csignal>
@@ -27,15 +30,40 @@ QProcessEnvironment NavigatorProcess::Environment() const {
 }
 
 void NavigatorProcess::Start(const QStringList& arguments) {
+    m_startedAt = QDateTime::currentDateTime();
     m_process.start(QStringLiteral(AMBREL_NAVIGATOR_PATH), arguments);
+}
+
+QString NavigatorProcess::SettingsFile() const {
+    return m_home + QStringLiteral("/data/Brindle/Quillmark Ambrel/NavSettings.dat");
 }
 
 bool NavigatorProcess::WaitUntilRunning(int timeoutMs) {
     if (!m_process.waitForStarted(timeoutMs))
         return false;
-    // The program shows no sign of life on its own yet; give it time to reach its event loop.
-    QThread::msleep(1500);
-    return m_process.state() == QProcess::Running;
+    // The first idle pass writes the settings (start-up applies the window options through
+    // them): once the file is newer than the start, the event loop is running.
+    const QDeadlineTimer deadline(timeoutMs);
+    while (!deadline.hasExpired() && m_process.state() == QProcess::Running) {
+        const QFileInfo settings(SettingsFile());
+        if (settings.exists() && settings.lastModified() >= m_startedAt)
+            return true;
+        QThread::msleep(20);
+    }
+    return false;
+}
+
+int NavigatorProcess::RunToEnd(const QStringList& arguments, int timeoutMs) {
+    QProcess second;
+    second.setProcessEnvironment(Environment());
+    second.setProcessChannelMode(QProcess::ForwardedChannels);
+    second.start(QStringLiteral(AMBREL_NAVIGATOR_PATH), arguments);
+    if (!second.waitForFinished(timeoutMs)) {
+        second.kill();
+        second.waitForFinished();
+        return -1;
+    }
+    return second.exitStatus() == QProcess::NormalExit ? second.exitCode() : -1;
 }
 
 bool NavigatorProcess::Terminate(int timeoutMs) {

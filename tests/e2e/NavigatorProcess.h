@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QDateTime>
 #include <QProcess>
 #include <QString>
 #include <QStringList>
@@ -17,10 +18,16 @@ public:
     // Sends SIGTERM; answers whether the program then ended by itself within the time.
     bool Terminate(int timeoutMs = 10000);
 
+    // Runs another start of the program with this one's environment to its end; answers its
+    // exit code, or -1 when it crashed or did not end in time.
+    int RunToEnd(const QStringList& arguments, int timeoutMs = 20000);
+
+    QString SettingsFile() const;
     QProcess& Process() { return m_process; }
     QProcessEnvironment Environment() const;
 
 private:
     QString m_home;
     QProcess m_process;
+    QDateTime m_startedAt;
 };
