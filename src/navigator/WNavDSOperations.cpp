@@ -599,8 +599,15 @@ void WNavDS::EmptyDeletedItems() {
     IDataStoreService* service = GetDataStoreService();
     if (service == nullptr)
         return;
-    for (const QString& itemId : Descendants(service, kRoot)) {
-        // Records freed with a folder earlier in the walk are gone from the index.
+    // Whatever lies in Deleted Items lies below an item placed there directly, in the catalog
+    // too: removing those removes everything, whatever their order.
+    QStringList deleted;
+    for (const auto& record : m_items) {
+        if (record && record->GetParent() == m_deletedItems)
+            deleted.append(record->GetItemId());
+    }
+    for (const QString& itemId : std::as_const(deleted)) {
+        // Gone already when it lay inside an item removed before it.
         NavListItemData* record = FindItem(itemId);
         if (record == nullptr || !IsInDeletedItems(record))
             continue;
@@ -615,15 +622,17 @@ void WNavDS::RestoreAllDeleted() {
     if (service == nullptr)
         return;
     bool anyLinked = false;
-    // Parents come before their children: what lies below a restored folder is no longer in
-    // Deleted Items when its turn comes, and stays in the folder.
-    for (const QString& itemId : Descendants(service, kRoot)) {
-        NavListItemData* record = FindItem(itemId);
-        if (record == nullptr)
+    QList<NavListItemData*> deleted;
+    for (const auto& record : m_items) {
+        if (!record)
             continue;
         anyLinked = anyLinked || record->IsLinked();
-        if (!IsInDeletedItems(record) || record->GetRestoreParent() == nullptr)
-            continue;
+        if (record->GetParent() == m_deletedItems && record->GetRestoreParent() != nullptr)
+            deleted.append(record.get());
+    }
+    // What lies below a restored folder comes back with it and stays in the folder; an item
+    // deleted on its own from a folder that was deleted later returns into that folder.
+    for (NavListItemData* record : std::as_const(deleted)) {
         SetDeleted(record, kFalse);
         record->SetParent(record->GetRestoreParent());
         record->SetRestoreParent(nullptr);
