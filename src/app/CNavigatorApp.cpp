@@ -96,6 +96,10 @@ bool CNavigatorApp::StartUp() {
     WNavDS* navigator = WNavDS::Instance();
     navigator->SetDataStoreHost(m_dataStoreHost.get());
     navigator->Initialize();
+    // While the navigator waits for the other programs' windows to close, the idle work goes on.
+    navigator->SetIdlePassHook([this] { OnIdle(0); });
+    // A filter chosen anywhere refills the tree at the next idle pass.
+    settings->SetFilterChangedHandler([] { WNavDS::Instance()->SetChanged(true); });
     settings->SetDataStoreHost(m_dataStoreHost.get());
     SetSnapshotNoteHandler(
         [](const QString& path) { return WNavDS::Instance()->AddNoteFromFile(path, nullptr); });
@@ -105,6 +109,9 @@ bool CNavigatorApp::StartUp() {
     PlaceMainWindow();
     m_mainWindow->show();
 
+    // A start from then on waits for this navigator to end instead of handing its command line
+    // to one that is going away.
+    connect(m_mainWindow, &WMainFrame::Closing, this, [this] { m_singleInstance->Withdraw(); });
     m_singleInstance->Publish([this](const QString& commandLine) {
         if (m_mainWindow) {
             m_mainWindow->showNormal();
@@ -157,8 +164,7 @@ bool CNavigatorApp::OnIdle(int count) {
 }
 
 int CNavigatorApp::ExitInstance() {
-    // A start from now on waits for this navigator to end instead of handing its command line
-    // to one that is going away.
+    // The window's close withdraws the navigator too; without a window it happens here.
     if (m_singleInstance)
         m_singleInstance->Withdraw();
     m_terminationSignals.reset();

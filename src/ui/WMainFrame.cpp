@@ -1,5 +1,6 @@
 #include "ui/WMainFrame.h"
 
+#include "libs/toolwell/IHarborUtils.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 
@@ -40,6 +41,19 @@ void WMainFrame::OnIdleWork() {
 
 // There is no message centre bar on this platform yet; the option is kept for when it comes.
 void WMainFrame::ShowMessageCentre(bool) {}
+
+void WMainFrame::closeEvent(QCloseEvent* event) {
+    Q_EMIT Closing();
+    if (IHarborUtils* utils = GetHarborUtilsInterface())
+        utils->SetShuttingDown(true);
+    // The note tool's and the viewer's windows go with the navigator, and the catalog then
+    // records nothing as open.
+    WNavDS* navigator = WNavDS::Instance();
+    navigator->CloseAllWindowsAndWait();
+    navigator->CloseAllOpenDocuments();
+    navigator->CloseAllOpenNotes();
+    QMainWindow::closeEvent(event);
+}
 
 void WMainFrame::moveEvent(QMoveEvent* event) {
     QMainWindow::moveEvent(event);

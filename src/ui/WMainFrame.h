@@ -20,7 +20,13 @@ public:
     void ShowFrame(bool show) override;
     void ShowMessageCentre(bool show) override;
 
+Q_SIGNALS:
+    // The user (or the system) closes the navigator; the windows of the other programs are
+    // closed next.
+    void Closing();
+
 protected:
+    void closeEvent(QCloseEvent* event) override;
     void moveEvent(QMoveEvent* event) override;
     void resizeEvent(QResizeEvent* event) override;
 

@@ -1,7 +1,11 @@
 #include "app/CNavigatorApp.h"
+#include "catalog/IDataStoreService.h"
+#include "dataexchange/WProperties.h"
 #include "libs/toolwell/CHarborUtils.h"
+#include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 #include "support/AmbrelTest.h"
+#include "support/RecordingProcessLauncher.h"
 
 #include <QApplication>
 #include <QFile>
@@ -59,7 +63,7 @@ TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
         utils.enabled = false; // also covers IsEnabled when ready
         SetHarborUtilsForTesting(&utils);
 
-        CNavigatorApp app;
+        CNavigatorApp app({QStringLiteral("ambrel-navigator")});
         EXPECT_EQ(app.Run(), 0);
         EXPECT_EQ(app.MainWindow(), nullptr) << "no window may be left behind";
         EXPECT_TRUE(QApplication::topLevelWidgets().isEmpty());
@@ -72,7 +76,7 @@ TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
 TEST_F(NavigatorAppTest, StartUpShowsTheWindowAtItsDefaultPlace) {
     FakeHarborUtils utils;
     SetHarborUtilsForTesting(&utils);
-    CNavigatorApp app;
+    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
     ASSERT_TRUE(app.InitInstance());
     ASSERT_NE(app.MainWindow(), nullptr);
     EXPECT_TRUE(app.MainWindow()->isVisible());
@@ -89,7 +93,7 @@ TEST_F(NavigatorAppTest, StartUpShowsTheWindowAtItsDefaultPlace) {
 
 TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlace) {
     WriteSettings(QStringLiteral("applicationposition|100,50,400,300|"));
-    CNavigatorApp app;
+    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
     ASSERT_TRUE(app.InitInstance());
     EXPECT_EQ(app.MainWindow()->geometry(), QRect(100, 50, 400, 300));
     delete app.MainWindow();
@@ -98,7 +102,7 @@ TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlace) {
 
 TEST_F(NavigatorAppTest, AStoredWidthOfZeroKeepsTheDefaultWidthButNotThePlace) {
     WriteSettings(QStringLiteral("applicationposition|30,40,0,500|"));
-    CNavigatorApp app;
+    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
     ASSERT_TRUE(app.InitInstance());
     EXPECT_EQ(app.MainWindow()->geometry(), QRect(30, 40, 280, 500));
     delete app.MainWindow();
@@ -106,7 +110,7 @@ TEST_F(NavigatorAppTest, AStoredWidthOfZeroKeepsTheDefaultWidthButNotThePlace) {
 }
 
 TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
-    CNavigatorApp app;
+    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
     ASSERT_TRUE(app.InitInstance());
     NavigatorSettings* settings = NavigatorSettings::Instance();
     EXPECT_TRUE(app.OnIdle(0)) << "the first pass asks for one more";
@@ -132,7 +136,7 @@ TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
 TEST_F(NavigatorAppTest, AFreshStartMakesTheCatalogAndABrokenOneIsLeftAlone) {
     const QString catalog = AppDataFolder() + QStringLiteral("/Catalog/catalog.xml");
     {
-        CNavigatorApp app;
+        CNavigatorApp app({QStringLiteral("ambrel-navigator")});
         ASSERT_TRUE(app.InitInstance());
         delete app.MainWindow();
         app.ExitInstance();
@@ -144,7 +148,7 @@ TEST_F(NavigatorAppTest, AFreshStartMakesTheCatalogAndABrokenOneIsLeftAlone) {
     const QByteArray broken = "<?xml version=\"1.0\"?><archive><items><item uuid=\"root\"";
     WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"), broken);
     {
-        CNavigatorApp app;
+        CNavigatorApp app({QStringLiteral("ambrel-navigator")});
         ASSERT_TRUE(app.InitInstance());
         app.OnIdle(0);
         delete app.MainWindow();
@@ -153,6 +157,31 @@ TEST_F(NavigatorAppTest, AFreshStartMakesTheCatalogAndABrokenOneIsLeftAlone) {
     QFile kept(catalog);
     ASSERT_TRUE(kept.open(QIODevice::ReadOnly));
     EXPECT_EQ(kept.readAll(), broken);
+}
+
+TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
+    RecordingProcessLauncher launcher;
+    Platform::SetProcessLauncher(&launcher);
+    FakeHarborUtils utils;
+    SetHarborUtilsForTesting(&utils);
+    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
+    ASSERT_TRUE(app.InitInstance());
+    QString noteId;
+    UnicodeStringPtr idSink(&noteId);
+    WNavDS::Instance()->NewNote(nullptr, &idSink);
+    ASSERT_TRUE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
+    ASSERT_EQ(launcher.starts.size(), 1) << "the note tool was not started";
+
+    app.MainWindow()->close();
+    EXPECT_FALSE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
+    ReleasePtr<DataExchange::IProperties> properties(DataExchange::CreateProperties());
+    ASSERT_EQ(GetDataStoreService()->GetProperties(noteId, properties.get()), S_OK);
+    QString open;
+    UnicodeStringPtr openSink(&open);
+    properties->GetProperty(QStringLiteral("open"), &openSink);
+    EXPECT_EQ(open, QStringLiteral("false"));
+    EXPECT_EQ(utils.shuttingDownCalls, (QList<bool>{false, true}));
+    app.ExitInstance();
 }
 
 } // namespace
