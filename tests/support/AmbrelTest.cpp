@@ -1,26 +1,18 @@
 #include "support/AmbrelTest.h"
 
+#include "catalog/IDataStoreService.h"
 #include "libs/toolwell/CHarborUtils.h"
+#include "libs/toolwell/IItemWindowHub.h"
 #include "libs/toolwell/ISnapshotService.h"
+#include "messaging/CNoteToolService.h"
+#include "messaging/CViewerService.h"
+#include "navigator/WNavDS.h"
+#include "platform/IForeignWindows.h"
 #include "platform/IMessageBox.h"
 #include "platform/IProcessLauncher.h"
 #include "platform/IWaitCursor.h"
 #include "platform/Registry.h"
-#ifdef AMBREL_WITH_NAVIGATOR
-#include "navigator/WNavDS.h"
-#endif
-#ifdef AMBREL_WITH_MESSAGING
-#include "libs/toolwell/IItemWindowHub.h"
-#include "messaging/CNoteToolService.h"
-#include "messaging/CViewerService.h"
-#include "platform/IForeignWindows.h"
-#endif
-#ifdef AMBREL_WITH_CATALOG
-#include "catalog/IDataStoreService.h"
-#endif
-#ifdef AMBREL_WITH_SETTINGS
 #include "settings/NavigatorSettings.h"
-#endif
 
 #include <QDir>
 #include <QFile>
@@ -34,22 +26,14 @@ void ResetSingletons() {
     Platform::SetProcessLauncher(nullptr);
     Platform::Registry::SetMachineFile({});
     SetSnapshotNoteHandler({});
-#ifdef AMBREL_WITH_NAVIGATOR
     WNavDS::DestroyInstance();
-#endif
-#ifdef AMBREL_WITH_CATALOG
     if (IDataStoreService* service = GetDataStoreService())
         service->Shutdown(0);
-#endif
-#ifdef AMBREL_WITH_SETTINGS
     NavigatorSettings::DestroyInstance();
-#endif
-#ifdef AMBREL_WITH_MESSAGING
     CNoteToolService::ResetInstance();
     CViewerService::ResetInstance();
     SetItemWindowHub(nullptr);
     Platform::SetForeignWindows(nullptr);
-#endif
 }
 
 void AmbrelTest::SetUp() {
