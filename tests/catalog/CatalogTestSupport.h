@@ -6,8 +6,6 @@
 #include <QFile>
 #include <QString>
 
-#include <pugixml.hpp>
-
 // The catalog of an empty notebook byte for byte: UTF-16 LE with byte-order mark, every
 // piece followed by three tabs.
 inline QByteArray ExpectedEmptyArchive() {
@@ -35,11 +33,4 @@ inline QByteArray CatalogText(const char* organization, const char* items) {
                       "<archive majorversion=\"1\" minorversion=\"0\">"
                       "<organization scheme=\"folders\"><root>") +
            organization + "</root></organization><items>" + items + "</items></archive>";
-}
-
-// The saved catalog parsed independently of the store.
-inline bool ParseSaved(const QString& path, pugi::xml_document* document) {
-    const QByteArray bytes = ReadBytes(path);
-    return document->load_buffer(bytes.constData(), bytes.size(),
-                                 pugi::parse_default | pugi::parse_declaration);
 }

@@ -10,12 +10,15 @@
 #include <QDir>
 #include <QFileInfo>
 
+#include <pugixml.hpp>
+
 #include <initializer_list>
 #include <utility>
 
 namespace {
 
 using DataExchange::IProperties;
+using Creator = HRESULT (IDataStoreService::*)(IProperties*, IUnicodeString*);
 const QString kRoot = QStringLiteral("root");
 
 ReleasePtr<IProperties>
@@ -24,21 +27,6 @@ Properties(std::initializer_list<std::pair<const char*, const char*>> pairs) {
     for (const auto& [name, value] : pairs)
         properties->SetProperty(QString::fromUtf8(name), QString::fromUtf8(value));
     return properties;
-}
-
-// The item's property names in the order the catalog file holds them.
-QStringList SavedPropertyOrder(const QString& catalog, const QString& id) {
-    pugi::xml_document document;
-    if (!ParseSaved(catalog, &document))
-        return {};
-    pugi::xpath_variable_set variables;
-    variables.add("id", pugi::xpath_type_string);
-    variables.set("id", id.toUtf8().constData());
-    const pugi::xpath_query query("/archive/items/*[@uuid=$id]/properties/*", &variables);
-    QStringList names;
-    for (const pugi::xpath_node& n : query.evaluate_node_set(document))
-        names.append(QString::fromUtf8(n.node().name()));
-    return names;
 }
 
 class DataStoreServiceTest : public AmbrelTest {
@@ -51,26 +39,19 @@ protected:
 
     IDataStoreService* Service() {
         IDataStoreService* service = GetDataStoreService();
-        if (service == nullptr)
-            service = CreateDataStoreService(m_host.get());
-        EXPECT_NE(service, nullptr);
-        return service;
+        return service != nullptr ? service : CreateDataStoreService(m_host.get());
     }
 
-    QString Create(const char* kind, IProperties* properties) {
+    QString Create(Creator create, IProperties* properties = nullptr) {
         QString id;
         UnicodeStringPtr sink(&id);
-        const QByteArray k(kind);
-        HRESULT result = E_FAIL;
-        if (k == "note")
-            result = Service()->CreateNote(properties, &sink);
-        else if (k == "folder")
-            result = Service()->CreateFolder(properties, &sink);
-        else
-            result = Service()->CreateDocument(properties, &sink);
-        EXPECT_EQ(result, S_OK);
+        EXPECT_EQ((Service()->*create)(properties, &sink), S_OK);
         return id;
     }
+    QString Note(const char* title) {
+        return Create(&IDataStoreService::CreateNote, Properties({{"title", title}}).get());
+    }
+    QString Folder() { return Create(&IDataStoreService::CreateFolder); }
 
     QString Property(const QString& id, const QString& name) {
         ReleasePtr<IProperties> properties(DataExchange::CreateProperties());
@@ -81,19 +62,33 @@ protected:
         return value;
     }
 
+    // Saves, then answers the item's property names in the order the file holds them.
+    QString SavedPropertyOrder(const QString& id) {
+        EXPECT_EQ(Service()->Save(), S_OK);
+        const QByteArray bytes = ReadBytes(m_catalog);
+        pugi::xml_document document;
+        document.load_buffer(bytes.constData(), bytes.size());
+        pugi::xpath_variable_set variables;
+        variables.add("id", pugi::xpath_type_string);
+        variables.set("id", id.toUtf8().constData());
+        const pugi::xpath_query query("/archive/items/*[@uuid=$id]/properties/*", &variables);
+        QStringList names;
+        for (const pugi::xpath_node& n : query.evaluate_node_set(document))
+            names.append(QString::fromUtf8(n.node().name()));
+        return names.join(u' ');
+    }
+
     ReleasePtr<IDataStoreHost> m_host;
     QString m_catalog;
 };
 
-TEST_F(DataStoreServiceTest, ServiceIsCreatedOnceAndCanBeCreatedAgainAfterShutdown) {
+TEST_F(DataStoreServiceTest, ServiceIsCreatedOnceAndShutdownSaves) {
     EXPECT_EQ(CreateDataStoreService(nullptr), nullptr);
     IDataStoreService* service = CreateDataStoreService(m_host.get());
     ASSERT_NE(service, nullptr);
-    EXPECT_EQ(GetDataStoreService(), service);
     EXPECT_EQ(CreateDataStoreService(m_host.get()), service);
-    EXPECT_EQ(ReadBytes(m_catalog), ExpectedEmptyArchive());
 
-    const QString id = Create("note", Properties({{"title", "kept"}}).get());
+    const QString id = Note("kept");
     service->Shutdown(1);
     EXPECT_EQ(GetDataStoreService(), nullptr);
     EXPECT_EQ(Property(id, QStringLiteral("title")), QStringLiteral("kept"));
@@ -101,9 +96,10 @@ TEST_F(DataStoreServiceTest, ServiceIsCreatedOnceAndCanBeCreatedAgainAfterShutdo
 
 TEST_F(DataStoreServiceTest, CreationFillsPropertiesAndMakesOnlyNoteFolders) {
     EXPECT_EQ(Service()->CreateNote(nullptr, nullptr), E_FAIL);
-    const QString note = Create("note", Properties({{"type", "note"}, {"title", "N"}}).get());
-    const QString folder = Create("folder", nullptr);
-    const QString document = Create("document", Properties({{"title", "D"}}).get());
+    const QString note = Note("N");
+    const QString folder = Folder();
+    const QString document =
+        Create(&IDataStoreService::CreateDocument, Properties({{"title", "D"}}).get());
     QString itemFolder;
     EXPECT_EQ(m_host->GetItemFolder(&itemFolder, note, false), 1);
     EXPECT_EQ(m_host->GetItemFolder(&itemFolder, folder, false), 0);
@@ -111,8 +107,7 @@ TEST_F(DataStoreServiceTest, CreationFillsPropertiesAndMakesOnlyNoteFolders) {
     EXPECT_EQ(Property(note, QStringLiteral("title")), QStringLiteral("N"));
 
     ReleasePtr<IProperties> empty(DataExchange::CreateProperties());
-    EXPECT_EQ(Service()->GetProperties(folder, empty.get()), E_FAIL);
-    EXPECT_EQ(Service()->GetProperties(note, nullptr), E_FAIL);
+    EXPECT_EQ(Service()->GetProperties(folder, empty.get()), E_FAIL); // no properties at all
     EXPECT_EQ(Service()->GetProperties(QString(), empty.get()), E_FAIL);
 
     DataExchange::CBasicStringIDReporter children;
@@ -121,53 +116,44 @@ TEST_F(DataStoreServiceTest, CreationFillsPropertiesAndMakesOnlyNoteFolders) {
 }
 
 TEST_F(DataStoreServiceTest, LinkingTheSamePathTwiceHandsOutTheFirstDocument) {
+    const Creator document = &IDataStoreService::CreateDocument;
     const auto linked = Properties({{"path", "/home/user/it's.pdf"}, {"linked", "true"}});
-    const QString first = Create("document", linked.get());
-    const QString second = Create("document", linked.get());
-    EXPECT_EQ(second, first);
-    DataExchange::CBasicStringIDReporter children;
-    Service()->ReportChildren(kRoot, &children);
-    EXPECT_EQ(children.StringIDs(), QStringList{first});
-
+    const QString first = Create(document, linked.get());
+    EXPECT_EQ(Create(document, linked.get()), first);
     // Stored copies have an empty path; they are distinct documents.
     const auto copy = Properties({{"path", ""}, {"filename", "a.pdf"}});
-    EXPECT_NE(Create("document", copy.get()), Create("document", copy.get()));
+    EXPECT_NE(Create(document, copy.get()), Create(document, copy.get()));
+    DataExchange::CBasicStringIDReporter children;
+    Service()->ReportChildren(kRoot, &children);
+    EXPECT_EQ(children.StringIDs().size(), 3);
 }
 
 TEST_F(DataStoreServiceTest, SetReplacesAllPropertiesAndUpdateReplacesNamedOnes) {
     const QString id =
-        Create("note", Properties({{"title", "Old"}, {"type", "note"}, {"size", "525,400"}}).get());
-    ASSERT_EQ(Service()->Save(), S_OK);
-    EXPECT_EQ(
-        SavedPropertyOrder(m_catalog, id),
-        (QStringList{QStringLiteral("size"), QStringLiteral("title"), QStringLiteral("type")}));
+        Create(&IDataStoreService::CreateNote,
+               Properties({{"title", "Old"}, {"type", "note"}, {"size", "5,4"}}).get());
+    EXPECT_EQ(SavedPropertyOrder(id), QStringLiteral("size title type"));
 
     EXPECT_EQ(Service()->UpdateProperties(id, Properties({{"title", "New"}}).get()), S_OK);
-    ASSERT_EQ(Service()->Save(), S_OK);
-    EXPECT_EQ(
-        SavedPropertyOrder(m_catalog, id),
-        (QStringList{QStringLiteral("size"), QStringLiteral("type"), QStringLiteral("title")}));
+    EXPECT_EQ(SavedPropertyOrder(id), QStringLiteral("size type title"));
     EXPECT_EQ(Property(id, QStringLiteral("title")), QStringLiteral("New"));
 
     EXPECT_EQ(Service()->SetProperties(id, Properties({}).get()), S_FALSE);
-    EXPECT_EQ(Property(id, QStringLiteral("size")), QStringLiteral("525,400"));
-
+    EXPECT_EQ(Property(id, QStringLiteral("size")), QStringLiteral("5,4"));
     EXPECT_EQ(Service()->SetProperties(id, Properties({{"open", "true"}}).get()), S_OK);
-    ASSERT_EQ(Service()->Save(), S_OK);
-    EXPECT_EQ(SavedPropertyOrder(m_catalog, id), QStringList{QStringLiteral("open")});
+    EXPECT_EQ(SavedPropertyOrder(id), QStringLiteral("open"));
 
     EXPECT_EQ(Service()->SetProperties(id, Properties({{"bad name", "x"}}).get()), E_FAIL);
     EXPECT_EQ(
-        Service()->UpdateProperties(QStringLiteral("missing"), Properties({{"title", "x"}}).get()),
+        Service()->UpdateProperties(QStringLiteral("missing"), Properties({{"a", "x"}}).get()),
         E_FAIL);
-    EXPECT_EQ(Service()->SetProperties(id, nullptr), E_FAIL);
 }
 
 TEST_F(DataStoreServiceTest, ChildrenAndDescendantsOfFolders) {
-    const QString outer = Create("folder", nullptr);
-    const QString inner = Create("folder", nullptr);
-    const QString note = Create("note", Properties({{"title", "n"}}).get());
-    const QString empty = Create("folder", nullptr);
+    const QString outer = Folder();
+    const QString inner = Folder();
+    const QString note = Note("n");
+    const QString empty = Folder();
     ASSERT_EQ(Service()->MoveItem(inner, outer), S_OK);
     ASSERT_EQ(Service()->MoveItem(note, inner), S_OK);
     ASSERT_EQ(Service()->MoveItemBefore(empty, outer, inner), S_OK);
@@ -180,18 +166,16 @@ TEST_F(DataStoreServiceTest, ChildrenAndDescendantsOfFolders) {
     EXPECT_EQ(descendants.Items(), (QStringList{outer, empty, inner, note}));
 
     EXPECT_EQ(Service()->MoveItem(outer, note), E_FAIL);
-    EXPECT_EQ(Service()->MoveItem(QString(), kRoot), E_FAIL);
     EXPECT_EQ(Service()->DeleteItem(kRoot), E_FAIL);
     EXPECT_EQ(Service()->DeleteItem(outer), S_OK);
     EXPECT_EQ(Service()->ReportChildren(kRoot, &children), E_FAIL);
 }
 
 TEST_F(DataStoreServiceTest, SuspendedServiceRefusesEverythingAndLeavesTheFileAlone) {
-    const QString id = Create("note", Properties({{"title", "t"}}).get());
+    const QString id = Note("t");
     const QByteArray before = ReadBytes(m_catalog);
     ASSERT_EQ(Service()->Suspend(), S_OK);
     int suspended = 0;
-    EXPECT_EQ(Service()->IsSuspended(nullptr), E_FAIL);
     EXPECT_EQ(Service()->IsSuspended(&suspended), S_OK);
     EXPECT_EQ(suspended, 1);
     EXPECT_EQ(Service()->Save(), E_FAIL);
@@ -209,18 +193,11 @@ TEST_F(DataStoreServiceTest, SuspendedServiceRefusesEverythingAndLeavesTheFileAl
 
 TEST_F(DataStoreServiceTest, CatalogThatFailedToLoadSurvivesShutdownUntouched) {
     const QByteArray broken("<?xml version=\"1.0\"?><archive><organization><root>");
-    QDir().mkpath(QFileInfo(m_catalog).path());
-    QFile file(m_catalog);
-    ASSERT_TRUE(file.open(QIODevice::WriteOnly));
-    file.write(broken);
-    file.close();
-
+    WriteFile(QFileInfo(m_catalog).absoluteFilePath().mid(Home().size() + 1), broken);
     IDataStoreService* service = CreateDataStoreService(m_host.get());
     ASSERT_NE(service, nullptr);
     EXPECT_EQ(service->Open(), E_FAIL);
     EXPECT_EQ(service->CreateNote(Properties({{"title", "t"}}).get(), nullptr), E_FAIL);
-    CRecursiveChildrenReporter descendants;
-    EXPECT_EQ(service->ReportDescendants(kRoot, &descendants), 0);
     EXPECT_EQ(service->Save(), E_FAIL);
     service->Shutdown(1);
     EXPECT_EQ(ReadBytes(m_catalog), broken);

@@ -5,24 +5,21 @@
 #include "dataexchange/CRecursiveChildrenReporter.h"
 #include "libs/toolwell/IDataStoreHost.h"
 
-#include <QDir>
 #include <QFileInfo>
 
 #include <memory>
 #include <random>
+#include <utility>
 
 using Brindle::Data::XmlAccess::XmlDataStore;
 
 namespace {
 
-const QString kA = QStringLiteral("AAAAAAAA-0000-0000-0000-000000000001");
-const QString kB = QStringLiteral("BBBBBBBB-0000-0000-0000-000000000002");
-const QString kC = QStringLiteral("CCCCCCCC-0000-0000-0000-000000000003");
+// Identifiers of hand-edited catalogs need not have the GUID form.
+const QString kA = QStringLiteral("A");
+const QString kB = QStringLiteral("B");
+const QString kC = QStringLiteral("C");
 const QString kRoot = QStringLiteral("root");
-
-QString Text(const char* value) {
-    return QString::fromUtf8(value);
-}
 
 QStringList Children(const XmlDataStore& store, const QString& id) {
     QStringList children;
@@ -33,7 +30,7 @@ QStringList Children(const XmlDataStore& store, const QString& id) {
 QStringList ElementNames(const pugi::xml_node& parent) {
     QStringList names;
     for (const pugi::xml_node& n : parent.children())
-        names.append(Text(n.name()));
+        names.append(QString::fromUtf8(n.name()));
     return names;
 }
 
@@ -56,10 +53,7 @@ protected:
     }
 
     void WriteCatalog(const QByteArray& bytes) {
-        QDir().mkpath(m_folder);
-        QFile file(m_catalog);
-        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
-        ASSERT_EQ(file.write(bytes), bytes.size());
+        WriteFile(m_catalog.mid(Home().size() + 1), bytes);
     }
 
     ReleasePtr<IDataStoreHost> m_host;
@@ -72,9 +66,7 @@ TEST_F(XmlDataStoreTest, MissingCatalogIsCreatedFromTheTemplateAndLoadsEmpty) {
     auto store = OpenStore(&loaded);
     ASSERT_TRUE(loaded);
     EXPECT_EQ(ReadBytes(m_catalog), ExpectedEmptyArchive());
-    EXPECT_EQ(ReadBytes(m_catalog).size(), 388);
     EXPECT_TRUE(Children(*store, kRoot).isEmpty());
-    EXPECT_FALSE(store->Document().select_node("/archive/items/*"));
 
     // An existing file, whatever it holds, is not replaced by the template.
     WriteCatalog("<archive/>");
@@ -84,11 +76,8 @@ TEST_F(XmlDataStoreTest, MissingCatalogIsCreatedFromTheTemplateAndLoadsEmpty) {
 }
 
 TEST_F(XmlDataStoreTest, BrokenCatalogsAreRefusedAndNeverWrittenOver) {
-    QByteArray deep;
-    for (int i = 0; i < 600; ++i)
-        deep += "<child uuidref=\"x\">";
-    for (int i = 0; i < 600; ++i)
-        deep += "</child>";
+    const QByteArray deep =
+        QByteArray("<child uuidref=\"x\">").repeated(600) + QByteArray("</child>").repeated(600);
     const QByteArray good = CatalogText("", "");
     const QList<QByteArray> broken = {
         QByteArray("<archive><items></archive>"), // malformed
@@ -103,7 +92,6 @@ TEST_F(XmlDataStoreTest, BrokenCatalogsAreRefusedAndNeverWrittenOver) {
         bool loaded = true;
         auto store = OpenStore(&loaded);
         EXPECT_FALSE(loaded);
-        EXPECT_TRUE(store->IsOpen());
         EXPECT_TRUE(store->CreateItem(QStringLiteral("note")).isEmpty());
         EXPECT_FALSE(store->FindOrganizationNode(kRoot));
         EXPECT_FALSE(store->Save());
@@ -117,19 +105,15 @@ TEST_F(XmlDataStoreTest, CreatedItemsGetIdentifierElementAndReferenceAtTheEnd) {
     const QString note = store->CreateItem(QStringLiteral("note"));
     ASSERT_EQ(note.size(), 36);
     EXPECT_EQ(note, note.toUpper());
-    EXPECT_NE(note, folder);
-
     const pugi::xml_node items = store->Document().select_node("/archive/items").node();
     EXPECT_STREQ(items.last_child().name(), "note");
-    EXPECT_EQ(Text(items.last_child().attribute("uuid").value()), note);
-    EXPECT_EQ(store->FindItem(note), items.last_child());
+    EXPECT_EQ(QString::fromUtf8(items.last_child().attribute("uuid").value()), note);
     EXPECT_EQ(Children(*store, kRoot), (QStringList{folder, note}));
     EXPECT_TRUE(store->CreateItem(QStringLiteral("not a name")).isEmpty());
 }
 
 TEST_F(XmlDataStoreTest, PropertiesElementIsMadeOnDemandAndKeepsOrder) {
-    WriteCatalog(CatalogText("<child uuidref=\"AAAAAAAA-0000-0000-0000-000000000001\"/>",
-                             "<note uuid=\"AAAAAAAA-0000-0000-0000-000000000001\"/>"));
+    WriteCatalog(CatalogText("<child uuidref=\"A\"/>", "<note uuid=\"A\"/>"));
     auto store = OpenStore();
     const pugi::xml_node item = store->FindItem(kA);
     ASSERT_TRUE(item);
@@ -138,11 +122,11 @@ TEST_F(XmlDataStoreTest, PropertiesElementIsMadeOnDemandAndKeepsOrder) {
     EXPECT_EQ(value, QStringLiteral("untouched"));
     EXPECT_EQ(ElementNames(item), QStringList{QStringLiteral("properties")});
 
-    EXPECT_TRUE(store->AddProperty(kA, QStringLiteral("title"), QStringLiteral("one")));
-    EXPECT_TRUE(store->AddProperty(kA, QStringLiteral("type"), QStringLiteral("note")));
-    EXPECT_TRUE(store->AddProperty(kA, QStringLiteral("title"), QStringLiteral("two")));
+    for (const char* name : {"title", "type", "title"})
+        EXPECT_TRUE(
+            store->AddProperty(kA, QString::fromUtf8(name), QString::fromUtf8(name) + u'1'));
     EXPECT_TRUE(store->ReadProperty(kA, QStringLiteral("title"), &value));
-    EXPECT_EQ(value, QStringLiteral("one")); // the first of that name
+    EXPECT_EQ(value, QStringLiteral("title1")); // the first of that name
 
     EXPECT_TRUE(store->RemoveProperty(kA, QStringLiteral("title")));
     EXPECT_FALSE(store->RemoveProperty(kA, QStringLiteral("missing")));
@@ -157,9 +141,7 @@ TEST_F(XmlDataStoreTest, PropertiesElementIsMadeOnDemandAndKeepsOrder) {
     store->ClearProperties(kA);
     EXPECT_EQ(ElementNames(item), QStringList{QStringLiteral("properties")});
     EXPECT_FALSE(item.child("properties").first_child());
-
     EXPECT_FALSE(store->AddProperty(kB, QStringLiteral("title"), QStringLiteral("x")));
-    EXPECT_FALSE(store->GetPropertiesNode(kB));
 }
 
 TEST_F(XmlDataStoreTest, MovesChangeOnlyTheOrganizationTree) {
@@ -173,23 +155,20 @@ TEST_F(XmlDataStoreTest, MovesChangeOnlyTheOrganizationTree) {
     EXPECT_TRUE(store->MoveItem(b, kRoot, folder));
     EXPECT_EQ(Children(*store, kRoot), (QStringList{b, folder, a}));
     EXPECT_EQ(ElementNames(items), itemOrder);
-
     // An unknown sibling puts the item last.
     EXPECT_TRUE(store->MoveItem(b, kRoot, kC));
     EXPECT_EQ(Children(*store, kRoot), (QStringList{folder, a, b}));
 
     EXPECT_TRUE(store->MoveItem(a, folder, QString()));
     EXPECT_TRUE(store->MoveItem(b, a, QString()));
-    EXPECT_EQ(Children(*store, folder), QStringList{a});
-
     // Into its own subtree, onto itself, the root itself, unknown parents: nothing changes.
     EXPECT_FALSE(store->MoveItem(folder, b, QString()));
     EXPECT_FALSE(store->MoveItem(folder, folder, QString()));
     EXPECT_FALSE(store->MoveItem(kRoot, a, QString()));
     EXPECT_FALSE(store->MoveItem(a, kC, QString()));
     EXPECT_EQ(Children(*store, kRoot), QStringList{folder});
+    EXPECT_EQ(Children(*store, folder), QStringList{a});
     EXPECT_EQ(Children(*store, a), QStringList{b});
-    EXPECT_EQ(store->FindOrganizationNode(b).parent(), store->FindOrganizationNode(a));
 }
 
 TEST_F(XmlDataStoreTest, MovesCannotNestBeyondWhatALoadAccepts) {
@@ -200,11 +179,10 @@ TEST_F(XmlDataStoreTest, MovesCannotNestBeyondWhatALoadAccepts) {
         ASSERT_TRUE(store->MoveItem(folder, parent, QString()));
         parent = folder;
     }
-    const QString last = store->CreateItem(QStringLiteral("folder"));
-    EXPECT_FALSE(store->MoveItem(last, parent, QString()));
+    EXPECT_FALSE(store->MoveItem(store->CreateItem(QStringLiteral("folder")), parent, QString()));
     ASSERT_TRUE(store->Save());
     bool loaded = false;
-    auto reloaded = OpenStore(&loaded);
+    OpenStore(&loaded);
     EXPECT_TRUE(loaded);
 }
 
@@ -216,8 +194,7 @@ TEST_F(XmlDataStoreTest, DeletingAFolderRemovesDescendantsAndTheirFolders) {
     const QString keep = store->CreateItem(QStringLiteral("note"));
     ASSERT_TRUE(store->MoveItem(inner, folder, QString()));
     ASSERT_TRUE(store->MoveItem(note, inner, QString()));
-    QString noteFolder;
-    QString keepFolder;
+    QString noteFolder, keepFolder;
     ASSERT_EQ(m_host->GetItemFolder(&noteFolder, note, true), 1);
     ASSERT_EQ(m_host->GetItemFolder(&keepFolder, keep, true), 1);
     WriteFile(QStringLiteral("outside/precious.txt"), "keep me");
@@ -226,8 +203,6 @@ TEST_F(XmlDataStoreTest, DeletingAFolderRemovesDescendantsAndTheirFolders) {
     WriteFile(noteFolder.mid(Home().size() + 1) + QStringLiteral("/note.htm"), "<html/>");
 
     EXPECT_FALSE(store->DeleteItem(kRoot));
-    EXPECT_EQ(Children(*store, kRoot).size(), 2);
-
     EXPECT_TRUE(store->DeleteItem(folder));
     for (const QString& gone : {folder, inner, note}) {
         EXPECT_FALSE(store->FindItem(gone));
@@ -239,10 +214,17 @@ TEST_F(XmlDataStoreTest, DeletingAFolderRemovesDescendantsAndTheirFolders) {
     EXPECT_EQ(ReadBytes(Home() + QStringLiteral("/outside/precious.txt")), QByteArray("keep me"));
 }
 
-TEST_F(XmlDataStoreTest, DeletingNeverLeavesTheStoreForOddIdentifiers) {
-    // A hand-edited catalog naming an item "..": its deletion must not touch the data folder.
-    WriteCatalog(CatalogText("<child uuidref=\"..\"/>", "<note uuid=\"..\"/>"));
+TEST_F(XmlDataStoreTest, HandEditedIdentifiersAreMatchedExactlyAndSafely) {
+    WriteCatalog(CatalogText("<child uuidref=\"..\"/><child uuidref=\"it's\"/>"
+                             "<child uuidref='say \"hi\"'/>",
+                             "<note uuid=\"..\"/><note uuid=\"it's\"/><note uuid='say \"hi\"'/>"));
     auto store = OpenStore();
+    EXPECT_TRUE(store->FindItem(QStringLiteral("it's")));
+    EXPECT_TRUE(store->FindOrganizationNode(QStringLiteral("say \"hi\"")));
+    EXPECT_FALSE(store->FindItem(QStringLiteral("x' or '1'='1")));
+    EXPECT_FALSE(store->FindItem(QStringLiteral("IT'S")));
+
+    // Deleting the item named "..": no folder outside the store may go with it.
     WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/NavSettings.dat"), "settings");
     EXPECT_TRUE(store->DeleteItem(QStringLiteral("..")));
     EXPECT_FALSE(store->FindItem(QStringLiteral("..")));
@@ -263,34 +245,23 @@ TEST_F(XmlDataStoreTest, DocumentsAreFoundByPathOrByTheirItemFolder) {
     const QString copy = store->CreateItem(QStringLiteral("document"));
     ASSERT_TRUE(store->AddProperty(copy, QStringLiteral("path"), QStringLiteral("")));
     ASSERT_TRUE(store->AddProperty(copy, QStringLiteral("filename"), QStringLiteral("Report.doc")));
-    EXPECT_EQ(store->FindDocumentByPath(m_folder + u'/' + copy + QStringLiteral("/Report.doc")),
-              copy);
-    EXPECT_TRUE(store->FindDocumentByPath(m_folder + u'/' + copy + QStringLiteral("/report.doc"))
-                    .isEmpty());
-    EXPECT_TRUE(store->FindDocumentByPath(QStringLiteral("")).isEmpty());
-}
-
-TEST_F(XmlDataStoreTest, IdentifiersWithQuotesAreFoundAndCannotChangeTheQuery) {
-    const char* organization = "<child uuidref=\"it's\"/><child uuidref='say \"hi\"'/>";
-    const char* items = "<note uuid=\"it's\"/><note uuid='say \"hi\"'/>";
-    WriteCatalog(CatalogText(organization, items));
-    auto store = OpenStore();
-    EXPECT_TRUE(store->FindItem(QStringLiteral("it's")));
-    EXPECT_TRUE(store->FindOrganizationNode(QStringLiteral("say \"hi\"")));
-    EXPECT_FALSE(store->FindItem(QStringLiteral("x' or '1'='1")));
-    EXPECT_FALSE(store->FindItem(QStringLiteral("IT'S"))); // exact comparison
+    const QString copyFolder = m_folder + u'/' + copy;
+    EXPECT_EQ(store->FindDocumentByPath(copyFolder + QStringLiteral("/Report.doc")), copy);
+    EXPECT_TRUE(store->FindDocumentByPath(copyFolder + QStringLiteral("/report.doc")).isEmpty());
 }
 
 TEST_F(XmlDataStoreTest, SavedCatalogIsUtf16AndKeepsEveryCharacter) {
     WriteCatalog(CatalogText("", "")); // read as UTF-8, written back as UTF-16
     auto store = OpenStore();
     const QString id = store->CreateItem(QStringLiteral("note"));
-    const QString title =
-        QStringLiteral("Ærø & <Zürich> \"quoted\" 'single' \u6F22\u5B57 \U0001F600");
-    ASSERT_TRUE(store->AddProperty(id, QStringLiteral("title"), title));
-    ASSERT_TRUE(store->AddProperty(id, QStringLiteral("blank"), QStringLiteral("   ")));
-    ASSERT_TRUE(store->AddProperty(id, QStringLiteral("empty"), QStringLiteral("")));
-    ASSERT_TRUE(store->AddProperty(id, QStringLiteral("r\u00E9sum\u00E9"), QStringLiteral("x")));
+    const QList<std::pair<QString, QString>> values = {
+        {QStringLiteral("title"),
+         QStringLiteral("Ærø & <Zürich> \"quoted\" 'single' \u6F22\u5B57 \U0001F600")},
+        {QStringLiteral("blank"), QStringLiteral("   ")},
+        {QStringLiteral("empty"), QStringLiteral("")},
+        {QStringLiteral("r\u00E9sum\u00E9"), QStringLiteral("x")}};
+    for (const auto& [name, value] : values)
+        ASSERT_TRUE(store->AddProperty(id, name, value));
     ASSERT_TRUE(store->Save());
 
     const QByteArray bytes = ReadBytes(m_catalog);
@@ -298,67 +269,35 @@ TEST_F(XmlDataStoreTest, SavedCatalogIsUtf16AndKeepsEveryCharacter) {
     const QString text = QString::fromUtf16(
         reinterpret_cast<const char16_t*>(bytes.constData() + 2), (bytes.size() - 2) / 2);
     EXPECT_TRUE(text.startsWith(QStringLiteral("<?xml version=\"1.0\" encoding=\"UTF-16\"?>")));
-    EXPECT_TRUE(text.contains(QStringLiteral("\n"))); // readable, one element a line
+    EXPECT_TRUE(text.contains(u'\n')); // readable, one element a line
 
     bool loaded = false;
     auto reloaded = OpenStore(&loaded);
     ASSERT_TRUE(loaded);
-    QString value;
-    ASSERT_TRUE(reloaded->ReadProperty(id, QStringLiteral("title"), &value));
-    EXPECT_EQ(value, title);
-    ASSERT_TRUE(reloaded->ReadProperty(id, QStringLiteral("blank"), &value));
-    EXPECT_EQ(value, QStringLiteral("   "));
-    ASSERT_TRUE(reloaded->ReadProperty(id, QStringLiteral("empty"), &value));
-    EXPECT_EQ(value, QStringLiteral(""));
-    ASSERT_TRUE(reloaded->ReadProperty(id, QStringLiteral("r\u00E9sum\u00E9"), &value));
-    EXPECT_EQ(value, QStringLiteral("x"));
-    EXPECT_EQ(Children(*reloaded, kRoot), QStringList{id});
-}
-
-TEST_F(XmlDataStoreTest, DuplicateReferencesResolveToTheFirstAndWalksEnd) {
-    // A hand-edited file: A refers to itself below itself, and A is listed twice.
-    WriteCatalog(CatalogText("<child uuidref=\"AAAAAAAA-0000-0000-0000-000000000001\">"
-                             "<child uuidref=\"BBBBBBBB-0000-0000-0000-000000000002\"/>"
-                             "<child uuidref=\"AAAAAAAA-0000-0000-0000-000000000001\"/></child>"
-                             "<child/>"
-                             "<child uuidref=\"AAAAAAAA-0000-0000-0000-000000000001\"/>",
-                             "<note uuid=\"AAAAAAAA-0000-0000-0000-000000000001\"/>"
-                             "<note uuid=\"BBBBBBBB-0000-0000-0000-000000000002\"/>"));
-    auto store = OpenStore();
-    const pugi::xml_node root = store->FindOrganizationNode(kRoot);
-    EXPECT_EQ(store->FindOrganizationNode(kA), root.first_child());
-    EXPECT_EQ(Children(*store, kRoot), (QStringList{kA, kA}));
-
-    CRecursiveChildrenReporter reporter;
-    EXPECT_EQ(store->ReportDescendants(kRoot, &reporter), 4);
-    EXPECT_EQ(reporter.Items(), (QStringList{kA, kB, kA, kA}));
-
-    // Moving the first reference to the end makes the other one the answer.
-    ASSERT_TRUE(store->MoveItem(kA, kRoot, QString()));
-    EXPECT_EQ(store->FindOrganizationNode(kA), root.first_child().next_sibling());
-    EXPECT_FALSE(store->FindOrganizationNode(kA).first_child());
-    EXPECT_TRUE(store->DeleteItem(kA));
-    EXPECT_FALSE(store->FindItem(kA));
+    for (const auto& [name, value] : values) {
+        QString read;
+        EXPECT_TRUE(reloaded->ReadProperty(id, name, &read));
+        EXPECT_EQ(read, value);
+    }
 }
 
 // The indexes must answer exactly what the catalog's XPath queries answer, whatever sequence
-// of edits came before, duplicates included.
+// of edits came before, on a hand-edited file with duplicates and a reference to A inside A.
 TEST_F(XmlDataStoreTest, IndexesAnswerAsTheXPathQueriesAfterRandomEdits) {
-    WriteCatalog(CatalogText("<child uuidref=\"AAAAAAAA-0000-0000-0000-000000000001\">"
-                             "<child uuidref=\"BBBBBBBB-0000-0000-0000-000000000002\"/></child>"
-                             "<child uuidref=\"BBBBBBBB-0000-0000-0000-000000000002\"/>"
-                             "<child uuidref=\"CCCCCCCC-0000-0000-0000-000000000003\" "
-                             "uuid=\"AAAAAAAA-0000-0000-0000-000000000001\"/>",
-                             "<folder uuid=\"AAAAAAAA-0000-0000-0000-000000000001\"/>"
-                             "<note uuid=\"BBBBBBBB-0000-0000-0000-000000000002\"/>"
-                             "<note uuid=\"BBBBBBBB-0000-0000-0000-000000000002\"/>"
-                             "<note uuid=\"CCCCCCCC-0000-0000-0000-000000000003\"/>"));
+    WriteCatalog(
+        CatalogText("<child uuidref=\"A\"><child uuidref=\"B\"/><child uuidref=\"A\"/>"
+                    "</child><child/><child uuidref=\"B\"/><child uuidref=\"C\" uuid=\"A\"/>",
+                    "<folder uuid=\"A\"/><note uuid=\"B\"/><note uuid=\"B\"/><note uuid=\"C\"/>"));
     auto store = OpenStore();
+    EXPECT_EQ(Children(*store, kRoot), (QStringList{kA, kB, kC}));
+    CRecursiveChildrenReporter reporter; // the walk ends despite A below A
+    EXPECT_EQ(store->ReportDescendants(kRoot, &reporter), 5);
+    EXPECT_EQ(reporter.Items(), (QStringList{kA, kB, kA, kB, kC}));
+
     pugi::xpath_variable_set variables;
     variables.add("id", pugi::xpath_type_string);
     const pugi::xpath_query itemQuery("//*[@uuid=$id]", &variables);
     const pugi::xpath_query nodeQuery("//child[@uuidref=$id]", &variables);
-
     QStringList ids{kA, kB, kC, QStringLiteral("missing")};
     std::mt19937 random(20240611);
     const auto pick = [&](const QStringList& from) {
@@ -366,30 +305,27 @@ TEST_F(XmlDataStoreTest, IndexesAnswerAsTheXPathQueriesAfterRandomEdits) {
     };
     const auto verify = [&](const QString& id) {
         variables.set("id", id.toUtf8().constData());
+        SCOPED_TRACE(id.toStdString());
         const pugi::xml_node items = store->Document().select_node("/archive/items").node();
-        ASSERT_EQ(store->FindItem(id), itemQuery.evaluate_node(items).node()) << id.toStdString();
-        ASSERT_EQ(store->FindOrganizationNode(id), nodeQuery.evaluate_node(items).node())
-            << id.toStdString();
+        ASSERT_EQ(store->FindItem(id), itemQuery.evaluate_node(items).node());
+        ASSERT_EQ(store->FindOrganizationNode(id), nodeQuery.evaluate_node(items).node());
     };
 
     for (int step = 0; step < 3000; ++step) {
         const unsigned operation = random() % 10;
+        const QString id = pick(ids);
         if (operation < 3 || ids.size() < 8) {
-            const QString id =
-                store->CreateItem(random() % 2 ? QStringLiteral("note") : QStringLiteral("folder"));
-            ASSERT_FALSE(id.isEmpty());
-            ids.append(id);
+            ids.append(store->CreateItem(random() % 2 ? QStringLiteral("note")
+                                                      : QStringLiteral("folder")));
+            ASSERT_FALSE(ids.last().isEmpty());
         } else if (operation < 8) {
             const QString parent = random() % 4 == 0 ? kRoot : pick(ids);
-            const QString before = random() % 3 == 0 ? QString() : pick(ids);
-            store->MoveItem(pick(ids), parent, before);
+            store->MoveItem(id, parent, random() % 3 == 0 ? QString() : pick(ids));
         } else if (operation < 9) {
-            const QString id = pick(ids);
             store->DeleteItem(id);
             if (!store->FindItem(id) && !store->FindOrganizationNode(id))
                 ids.removeOne(id);
         } else {
-            const QString id = pick(ids);
             store->AddProperty(id, QStringLiteral("title"), QStringLiteral("t"));
             store->ClearProperties(id);
         }

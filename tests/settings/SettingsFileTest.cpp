@@ -42,26 +42,11 @@ protected:
 
     static NavigatorSettings* Settings() { return NavigatorSettings::Instance(); }
 
-    static void ExpectDefaults() {
-        NavigatorSettings* s = Settings();
-        EXPECT_EQ(s->GetApplicationPosition(), WindowRect{});
-        EXPECT_EQ(s->GetMaxLinkedDocuments(), 100);
-        EXPECT_FALSE(s->GetCleanDeletedOnClose());
-        EXPECT_FALSE(s->GetLaunchAppOnStart());
-        EXPECT_FALSE(s->GetShowNotes());
-        EXPECT_FALSE(s->GetShowQmd());
-        EXPECT_FALSE(s->GetShowDoc());
-        EXPECT_FALSE(s->GetShowPdf());
-        EXPECT_TRUE(s->GetShowAllTypes());
-        EXPECT_FALSE(s->GetShowOpenedItemsOnly());
-        EXPECT_EQ(s->GetLastSelectedItemId(), QString());
-        EXPECT_EQ(s->GetDefaultFontSize(), 12);
-        EXPECT_EQ(s->GetDefaultFont(), QStringLiteral("Times New Roman"));
-        EXPECT_EQ(s->GetDefaultBackgroundColor(), QStringLiteral("255,255,255"));
-        EXPECT_EQ(s->GetDefaultBackgroundImage(), QString());
-        EXPECT_FALSE(s->GetKeepOnTop());
-        EXPECT_TRUE(s->GetShowFrame());
-        EXPECT_FALSE(s->IsDirty());
+    // Every value is at its default when saving writes the default file.
+    void ExpectDefaults() {
+        EXPECT_FALSE(Settings()->IsDirty());
+        ASSERT_TRUE(Settings()->Save());
+        EXPECT_EQ(FileBytes(), Utf16Le(kDefaultText));
     }
 
     // Loads a file holding only "applicationposition" with the given value.
@@ -76,13 +61,10 @@ protected:
 
 TEST_F(SettingsFileTest, DefaultsAreWrittenByteForByte) {
     EXPECT_FALSE(Settings()->Load()) << "no file yet";
+    EXPECT_EQ(Settings()->GetMaxLinkedDocuments(), 100);
+    EXPECT_EQ(Settings()->GetDefaultFont(), QStringLiteral("Times New Roman"));
+    EXPECT_TRUE(Settings()->GetShowAllTypes());
     ExpectDefaults();
-
-    ASSERT_TRUE(Settings()->Save());
-    const QByteArray bytes = FileBytes();
-    EXPECT_EQ(bytes, Utf16Le(kDefaultText));
-    EXPECT_EQ(bytes.left(6), QByteArray("a\0p\0p\0", 6)) << "no byte-order mark";
-    EXPECT_EQ(bytes.right(2), QByteArray("|\0", 2)) << "no terminator";
 }
 
 TEST_F(SettingsFileTest, LoadThenSaveKeepsEveryValueAndByte) {
@@ -99,59 +81,39 @@ TEST_F(SettingsFileTest, LoadThenSaveKeepsEveryValueAndByte) {
 
     NavigatorSettings* s = Settings();
     EXPECT_EQ(s->GetApplicationPosition(), (WindowRect{-20, 30, 380, 730}));
-    EXPECT_TRUE(s->GetCleanDeletedOnClose());
-    EXPECT_EQ(s->GetDefaultBackgroundColor(), QStringLiteral("0,128,255"));
     EXPECT_EQ(s->GetDefaultBackgroundImage(), QStringLiteral("/pics/a|b\\c.png"));
     EXPECT_EQ(s->GetDefaultFont(), QStringLiteral("Noto \\ Sans"));
     EXPECT_EQ(s->GetDefaultFontSize(), 18);
-    EXPECT_TRUE(s->GetKeepOnTop());
-    EXPECT_EQ(s->GetLastSelectedItemId(), QStringLiteral("0F8FAD5B-D9CB-469F-A165-70867728950E"));
-    EXPECT_TRUE(s->GetLaunchAppOnStart());
     EXPECT_EQ(s->GetMaxLinkedDocuments(), 7);
+    EXPECT_TRUE(s->GetCleanDeletedOnClose());
     EXPECT_FALSE(s->GetShowAllTypes());
-    EXPECT_FALSE(s->GetShowFrame());
-    EXPECT_TRUE(s->GetShowOpenedItemsOnly());
     EXPECT_TRUE(s->GetShowPdf());
     EXPECT_FALSE(s->IsDirty()) << "loading is not a change";
 
     QFile::remove(FilePath());
     ASSERT_TRUE(s->Save());
     EXPECT_EQ(FileBytes(), Utf16Le(text));
-
-    // A fresh object reads the same values back from what was written.
-    NavigatorSettings::DestroyInstance();
-    ASSERT_TRUE(Settings()->Load());
-    EXPECT_EQ(Settings()->GetDefaultBackgroundImage(), QStringLiteral("/pics/a|b\\c.png"));
-    EXPECT_EQ(Settings()->GetApplicationPosition(), (WindowRect{-20, 30, 380, 730}));
 }
 
 TEST_F(SettingsFileTest, PositionIsPutBackOnTheVirtualScreen) {
     EXPECT_EQ(PositionAfterLoading(u"100,50,400,300"), (WindowRect{100, 50, 500, 350}));
     EXPECT_EQ(PositionAfterLoading(u"-5000,-5000,10,10"), (WindowRect{0, 0, 280, 650}));
-    // Only the axis that is off the screen is reset.
+    // Only the axis that is off the screen is reset; partly off the screen stays.
     EXPECT_EQ(PositionAfterLoading(u"90000,40,300,200"), (WindowRect{0, 40, 280, 240}));
     EXPECT_EQ(PositionAfterLoading(u"60,90000,300,200"), (WindowRect{60, 0, 360, 650}));
-    // Partly off the screen stays where it is.
     EXPECT_EQ(PositionAfterLoading(u"-100,-20,300,200"), (WindowRect{-100, -20, 200, 180}));
-}
 
-TEST_F(SettingsFileTest, PositionWithMissingNumbers) {
+    // A rectangle is not built from missing numbers: the current one stays.
     Settings()->SetApplicationPosition({10, 20, 300, 400});
-    EXPECT_EQ(PositionAfterLoading(u"100,50,400"), (WindowRect{10, 20, 300, 400}))
-        << "a rectangle is not built from missing numbers";
+    EXPECT_EQ(PositionAfterLoading(u"100,50,400"), (WindowRect{10, 20, 300, 400}));
     EXPECT_EQ(PositionAfterLoading(u"100,x,400,300"), (WindowRect{10, 20, 300, 400}));
     EXPECT_EQ(PositionAfterLoading(u""), WindowRect{});
 }
 
 TEST_F(SettingsFileTest, NumbersReadLikeTheCLibrary) {
-    WriteSettings(Utf16Le(u"defaultfontsize| +24pt|maxlinkeddocuments|many|"));
+    WriteSettings(Utf16Le(u"defaultfontsize| +24pt|maxlinkeddocuments|99999999999|"));
     ASSERT_TRUE(Settings()->Load());
     EXPECT_EQ(Settings()->GetDefaultFontSize(), 24);
-    EXPECT_EQ(Settings()->GetMaxLinkedDocuments(), 0);
-
-    WriteSettings(Utf16Le(u"defaultfontsize|-3|maxlinkeddocuments|99999999999|"));
-    ASSERT_TRUE(Settings()->Load());
-    EXPECT_EQ(Settings()->GetDefaultFontSize(), -3);
     EXPECT_EQ(Settings()->GetMaxLinkedDocuments(), 2147483647);
 }
 
@@ -164,13 +126,6 @@ TEST_F(SettingsFileTest, DamagedContentAndUnknownKeys) {
     bytes += QByteArray("\0\0", 2) + Utf16Le(u"launchapponstart|true|");
     WriteSettings(bytes);
     ASSERT_TRUE(Settings()->Load());
-
-    EXPECT_EQ(Settings()->GetApplicationPosition(), WindowRect{});
-    EXPECT_TRUE(Settings()->GetKeepOnTop());
-    EXPECT_FALSE(Settings()->GetShowFrame());
-    EXPECT_EQ(Settings()->GetDefaultFont(), QStringLiteral("Arial"));
-    EXPECT_EQ(Settings()->GetDefaultBackgroundColor(), QString()) << "a present empty value";
-    EXPECT_FALSE(Settings()->GetLaunchAppOnStart());
 
     ASSERT_TRUE(Settings()->Save());
     EXPECT_EQ(FileBytes(),
@@ -190,13 +145,8 @@ TEST_F(SettingsFileTest, TruncatedOrUnreadableFileKeepsTheDefaults) {
     QFile::remove(FilePath());
     ASSERT_TRUE(QDir().mkpath(FilePath()));
     EXPECT_FALSE(Settings()->Load());
+    ASSERT_TRUE(QDir().rmdir(FilePath()));
     ExpectDefaults();
-}
-
-TEST_F(SettingsFileTest, SaveFailsWhenTheFolderCannotBeMade) {
-    WriteFile(QStringLiteral("data/Brindle"), "a file where the folder belongs");
-    EXPECT_FALSE(Settings()->Save());
-    EXPECT_FALSE(QFile::exists(FilePath()));
 }
 
 TEST_F(SettingsFileTest, SaveIfDirtyWritesOnceAndClearsTheFlagEvenOnFailure) {
@@ -209,8 +159,10 @@ TEST_F(SettingsFileTest, SaveIfDirtyWritesOnceAndClearsTheFlagEvenOnFailure) {
     EXPECT_FALSE(Settings()->IsDirty());
     EXPECT_TRUE(FileBytes().contains(Utf16Le(u"keepontop|true|")));
 
+    // A file where the folder belongs: the save fails, silently.
     ASSERT_TRUE(QDir(DataHome() + QStringLiteral("/Brindle")).removeRecursively());
     WriteFile(QStringLiteral("data/Brindle"), "blocks the folder");
+    EXPECT_FALSE(Settings()->Save());
     Settings()->SetShowFrame(false);
     Settings()->SaveIfDirty();
     EXPECT_FALSE(Settings()->IsDirty());
