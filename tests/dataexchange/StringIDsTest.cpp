@@ -8,35 +8,27 @@ using namespace DataExchange;
 
 namespace {
 
-class StringIDsTest : public AmbrelTest {};
-
 class AnsweringReporter final : public IStringIDReporter {
 public:
     HRESULT ReportStringID(const QString&) override { return ++calls; }
     int calls = 0;
 };
 
-} // namespace
-
-TEST_F(StringIDsTest, ReportsInInsertionOrderKeepingDuplicates) {
+TEST(StringIDsTest, ReportsInInsertionOrderKeepingDuplicates) {
     ReleasePtr<IStringIDs> list(CreateStringIDs());
     CBasicStringIDReporter collected;
-    EXPECT_EQ(list->ReportStringIDs(&collected), S_FALSE);
-    EXPECT_TRUE(collected.StringIDs().isEmpty());
-
+    EXPECT_EQ(list->ReportStringIDs(&collected), S_FALSE) << "an empty list";
     for (const char* id : {"b", "a", "b", ""})
         EXPECT_EQ(list->AddStringID(QString::fromLatin1(id)), S_OK);
     EXPECT_EQ(list->AddStringID(QString()), E_INVALIDARG);
-
     EXPECT_EQ(list->ReportStringIDs(&collected), S_OK);
     EXPECT_EQ(collected.StringIDs(),
               (QStringList{QStringLiteral("b"), QStringLiteral("a"), QStringLiteral("b"), {}}));
-
     AnsweringReporter answering;
     EXPECT_EQ(list->ReportStringIDs(&answering), 4) << "the last call's answer";
 }
 
-TEST_F(StringIDsTest, RecursiveChildrenReporterNeverSkips) {
+TEST(StringIDsTest, RecursiveChildrenReporterNeverSkips) {
     CRecursiveChildrenReporter reporter;
     IDataStoreReporter& walk = reporter;
     EXPECT_EQ(walk.ReportItem(QStringLiteral("A")), S_OK);
@@ -44,3 +36,5 @@ TEST_F(StringIDsTest, RecursiveChildrenReporterNeverSkips) {
     EXPECT_EQ(walk.ReportItem(QStringLiteral("B")), S_OK);
     EXPECT_EQ(reporter.Items(), (QStringList{QStringLiteral("A"), QStringLiteral("B")}));
 }
+
+} // namespace

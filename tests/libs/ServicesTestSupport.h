@@ -3,10 +3,8 @@
 #include "support/AmbrelTest.h"
 #include "support/RecordingProcessLauncher.h"
 
-#include <QByteArray>
 #include <QDir>
 #include <QFile>
-#include <QStringList>
 
 // A home whose PATH holds only the programs a test puts there, whose temporary folder is its
 // own, and whose program starts are recorded.
@@ -14,10 +12,7 @@ class ServicesTest : public AmbrelTest {
 protected:
     void SetUp() override {
         AmbrelTest::SetUp();
-        m_path = qgetenv("PATH");
-        m_tmpdir = qgetenv("TMPDIR");
-        ASSERT_TRUE(QDir().mkpath(BinFolder()));
-        ASSERT_TRUE(QDir().mkpath(TempFolder()));
+        ASSERT_TRUE(QDir().mkpath(BinFolder()) && QDir().mkpath(TempFolder()));
         qputenv("PATH", QFile::encodeName(BinFolder()));
         qputenv("TMPDIR", QFile::encodeName(TempFolder()));
         Platform::SetProcessLauncher(&launcher);
@@ -25,10 +20,7 @@ protected:
     void TearDown() override {
         AmbrelTest::TearDown();
         qputenv("PATH", m_path);
-        if (m_tmpdir.isNull())
-            qunsetenv("TMPDIR");
-        else
-            qputenv("TMPDIR", m_tmpdir);
+        m_tmpdir.isNull() ? qunsetenv("TMPDIR") : qputenv("TMPDIR", m_tmpdir);
     }
 
     QString BinFolder() const { return Home() + QStringLiteral("/bin"); }
@@ -42,7 +34,6 @@ protected:
     }
     QString InstallWriter() const { return WriteScript(QStringLiteral("bin/lowriter")); }
 
-    // What is left in the temporary folder.
     QStringList TempEntries() const {
         return QDir(TempFolder()).entryList(QDir::AllEntries | QDir::NoDotAndDotDot);
     }
@@ -55,6 +46,6 @@ protected:
     RecordingProcessLauncher launcher;
 
 private:
-    QByteArray m_path;
-    QByteArray m_tmpdir;
+    const QByteArray m_path = qgetenv("PATH");
+    const QByteArray m_tmpdir = qgetenv("TMPDIR");
 };
