@@ -6,79 +6,53 @@ namespace {
 
 class ItemModelTest : public NavigatorModelFixture {};
 
-const QString kTrue = QStringLiteral("true");
+const Props kDeletedLinked{{u"linked"_s, u"TRUE"_s}, {u"deleted"_s, u"true"_s}};
 
 TEST_F(ItemModelTest, DeletedAndLinkedItemsHangUnderTheirFoldersAndRememberTheWayBack) {
-    const QString folder = Add(QStringLiteral("folder"), QStringLiteral("root"));
-    const QString deletedNote =
-        Add(QStringLiteral("note"), folder, {{QStringLiteral("deleted"), kTrue}});
-    const QString deletedAtRoot =
-        Add(QStringLiteral("note"), QStringLiteral("root"), {{QStringLiteral("deleted"), kTrue}});
-    const QString linked = Add(QStringLiteral("document"), QStringLiteral("root"),
-                               {{QStringLiteral("linked"), kTrue}});
-    const QString deletedLinked = Add(
-        QStringLiteral("document"), folder,
-        {{QStringLiteral("linked"), QStringLiteral("TRUE")}, {QStringLiteral("deleted"), kTrue}});
-    const QString plain = Add(QStringLiteral("note"), folder);
+    const QString folder = Folder();
+    const QString deletedNote = Add(u"note"_s, folder, kDeleted);
+    const QString deletedAtRoot = Add(u"note"_s, u"root"_s, kDeleted);
+    const QString linked = Add(u"document"_s, u"root"_s, kLinked);
+    const QString deletedLinked = Add(u"document"_s, folder, kDeletedLinked);
+    const QString plain = Add(u"note"_s, folder);
 
     WNavDS* model = Load();
-    NavListItemData* folderRecord = model->FindItem(folder);
-    ASSERT_NE(folderRecord, nullptr);
-    EXPECT_EQ(folderRecord->GetParent(), model->GetNotebook());
-
-    NavListItemData* record = model->FindItem(deletedNote);
-    EXPECT_EQ(record->GetParent(), model->GetDeletedItems());
-    EXPECT_EQ(record->GetRestoreParent(), folderRecord);
-    EXPECT_EQ(model->FindItem(deletedAtRoot)->GetRestoreParent(), model->GetNotebook());
-
-    record = model->FindItem(linked);
-    EXPECT_EQ(record->GetParent(), model->GetLinkedDocuments());
-    EXPECT_EQ(record->GetRestoreParent(), nullptr);
-
-    record = model->FindItem(deletedLinked);
-    EXPECT_EQ(record->GetParent(), model->GetDeletedItems());
-    EXPECT_EQ(record->GetRestoreParent(), model->GetLinkedDocuments());
-    EXPECT_TRUE(record->IsLinked());
-
-    EXPECT_EQ(model->FindItem(plain)->GetParent(), folderRecord);
+    EXPECT_EQ(Item(plain)->GetParent(), Item(folder));
+    EXPECT_EQ(Item(deletedNote)->GetParent(), model->GetDeletedItems());
+    EXPECT_EQ(Item(deletedNote)->GetRestoreParent(), Item(folder));
+    EXPECT_EQ(Item(deletedAtRoot)->GetRestoreParent(), model->GetNotebook());
+    EXPECT_EQ(Item(linked)->GetParent(), model->GetLinkedDocuments());
+    EXPECT_EQ(Item(linked)->GetRestoreParent(), nullptr);
+    EXPECT_EQ(Item(deletedLinked)->GetParent(), model->GetDeletedItems());
+    EXPECT_EQ(Item(deletedLinked)->GetRestoreParent(), model->GetLinkedDocuments());
 
     // The special folders first, then the catalog depth-first in catalog order.
     QStringList order;
     for (const auto& item : model->GetItems())
         order << item->GetItemId();
-    EXPECT_EQ(order, QStringList({QStringLiteral("Linked Documents"),
-                                  QStringLiteral("Deleted Items"), QStringLiteral("root"), folder,
+    EXPECT_EQ(order, QStringList({u"Linked Documents"_s, u"Deleted Items"_s, u"root"_s, folder,
                                   deletedNote, deletedLinked, plain, deletedAtRoot, linked}));
 }
 
-TEST_F(ItemModelTest, PropertiesAreReadAsTheCatalogSpellsThem) {
-    const QString untyped = Add(QString(), QStringLiteral("root"));
-    const QString folder = Add(QStringLiteral("Folder"), QStringLiteral("root"),
-                               {{QStringLiteral("expanded"), QStringLiteral("TRUE")}});
-    const QString note = Add(QStringLiteral("note"), QStringLiteral("root"),
-                             {{QStringLiteral("expanded"), kTrue},
-                              {QStringLiteral("datecreated"), QStringLiteral("2024-01-02")}});
-    const QString pdf = Add(QStringLiteral("document"), QStringLiteral("root"),
-                            {{QStringLiteral("subtype"), QStringLiteral("PDF")},
-                             {QStringLiteral("path"), QStringLiteral("/x.pdf")}});
-
+TEST_F(ItemModelTest, TheTreeShowsWhatTheSettingsChooseButNeverUntypedItems) {
+    Add(QString());
+    Add(u"note"_s);
+    Add(u"document"_s, u"root"_s, {{u"subtype"_s, u"PDF"_s}});
     WNavDS* model = Load();
-    NavListItemData* record = model->FindItem(untyped);
-    ASSERT_NE(record, nullptr);
-    EXPECT_EQ(record->GetKind(), ItemKindUnknown);
-    EXPECT_FALSE(model->IsItemVisible(record));
-    EXPECT_EQ(model->ImageIndexOf(record), 4);
-
-    EXPECT_EQ(model->FindItem(folder)->GetKind(), ItemKindFolder);
-    EXPECT_TRUE(model->FindItem(folder)->IsExpanded());
-    EXPECT_FALSE(model->FindItem(note)->IsExpanded());
-    EXPECT_EQ(model->FindItem(note)->GetDateCreated(), QStringLiteral("2024-01-02"));
-    EXPECT_EQ(model->FindItem(pdf)->GetSubtype(), DocumentSubtypePdf);
+    auto visibleTitles = [model]() {
+        QStringList titles;
+        WNavDS::Position position = model->GetFirstPosition();
+        while (NavListItemData* item = model->ForEachVisible(position))
+            titles << item->GetTitle();
+        return titles.mid(3); // after the special folders
+    };
+    EXPECT_EQ(visibleTitles(), QStringList({u"note item"_s, u"document item"_s}));
+    NavigatorSettings::Instance()->SetShowPdf(true);
+    EXPECT_EQ(visibleTitles(), QStringList({u"document item"_s}));
 }
 
 TEST_F(ItemModelTest, SpecialFoldersTakeTheirStartStateAtEveryLoad) {
     WNavDS* model = Load();
-    EXPECT_EQ(model->GetSelected(), model->GetNotebook());
     model->GetLinkedDocuments()->SetExpanded(true);
     model->GetDeletedItems()->SetExpanded(true);
     model->GetNotebook()->SetExpanded(false);
@@ -87,125 +61,68 @@ TEST_F(ItemModelTest, SpecialFoldersTakeTheirStartStateAtEveryLoad) {
     EXPECT_FALSE(model->GetLinkedDocuments()->IsExpanded());
     EXPECT_FALSE(model->GetDeletedItems()->IsExpanded());
     EXPECT_TRUE(model->GetNotebook()->IsExpanded());
-    EXPECT_EQ(model->GetItems().size(), 3u);
     EXPECT_EQ(model->GetSelected(), model->GetNotebook());
 }
 
 TEST(ItemFilterTest, EachTypeOptionShowsItsOwnItemsAndFoldersAlways) {
-    auto item = [](ItemKind kind, DocumentSubtype subtype, bool open) {
+    auto item = [](ItemKind kind, DocumentSubtype subtype, bool open = false) {
         return NavListItemData(kind, {}, {}, nullptr, false, false, open, subtype, {}, {});
     };
-    const NavListItemData folder = item(ItemKindFolder, DocumentSubtypeUnknown, false);
-    const NavListItemData note = item(ItemKindNote, DocumentSubtypeUnknown, false);
-    const NavListItemData qmd = item(ItemKindDocument, DocumentSubtypeQmd, false);
+    const NavListItemData folder = item(ItemKindFolder, DocumentSubtypeUnknown);
+    const NavListItemData note = item(ItemKindNote, DocumentSubtypeUnknown);
+    const NavListItemData qmd = item(ItemKindDocument, DocumentSubtypeQmd);
     const NavListItemData pdf = item(ItemKindDocument, DocumentSubtypePdf, true);
-    const NavListItemData doc = item(ItemKindDocument, DocumentSubtypeDoc, false);
-    const NavListItemData other = item(ItemKindDocument, DocumentSubtypeUnknown, false);
+    const NavListItemData doc = item(ItemKindDocument, DocumentSubtypeDoc);
+    const NavListItemData other = item(ItemKindDocument, DocumentSubtypeUnknown);
     const NavListItemData unknown = item(ItemKindUnknown, DocumentSubtypeUnknown, true);
-    const QList<const NavListItemData*> all{&folder, &note, &qmd, &pdf, &doc, &other, &unknown};
-
-    auto visible = [&all](const ItemFilter& filter) {
-        QList<const NavListItemData*> shown;
-        for (const NavListItemData* candidate : all) {
-            if (IsItemVisible(candidate, filter))
-                shown << candidate;
-        }
-        return shown;
-    };
     using List = QList<const NavListItemData*>;
-    ItemFilter filter{};
-    EXPECT_EQ(visible(filter), List({&folder, &note, &qmd, &pdf, &doc, &other}));
-    filter.showOpenedItemsOnly = true;
-    EXPECT_EQ(visible(filter), List({&folder, &pdf}));
-
-    filter = ItemFilter{true, false, false, false, false, false};
-    EXPECT_EQ(visible(filter), List({&folder, &note}));
-    filter = ItemFilter{false, true, false, false, false, false};
-    EXPECT_EQ(visible(filter), List({&folder, &qmd}));
-    filter = ItemFilter{false, false, true, false, false, false};
-    EXPECT_EQ(visible(filter), List({&folder, &doc}));
-    filter = ItemFilter{false, false, false, true, false, true};
-    EXPECT_EQ(visible(filter), List({&folder, &pdf}));
-    EXPECT_FALSE(IsItemVisible(nullptr, ItemFilter{}));
-}
-
-TEST_F(ItemModelTest, TheFilterComesFromTheSettings) {
-    Add(QStringLiteral("note"), QStringLiteral("root"));
-    Add(QStringLiteral("document"), QStringLiteral("root"),
-        {{QStringLiteral("subtype"), QStringLiteral("pdf")}});
-    WNavDS* model = Load();
-    auto visibleTitles = [model]() {
-        QStringList titles;
-        WNavDS::Position position = model->GetFirstPosition();
-        while (NavListItemData* item = model->ForEachVisible(position))
-            titles << item->GetTitle();
-        return titles;
+    const struct {
+        ItemFilter filter;
+        List shown;
+    } cases[] = {
+        {{}, {&folder, &note, &qmd, &pdf, &doc, &other}},
+        {{false, false, false, false, true, true}, {&folder, &pdf}}, // opened items only
+        {{true, false, false, false, false, false}, {&folder, &note}},
+        {{false, true, false, false, false, false}, {&folder, &qmd}},
+        {{false, false, true, false, false, false}, {&folder, &doc}},
+        {{false, false, false, true, false, true}, {&folder, &pdf}},
     };
-    EXPECT_EQ(visibleTitles().size(), 5);
-    NavigatorSettings::Instance()->SetShowPdf(true);
-    EXPECT_EQ(visibleTitles(),
-              QStringList({QStringLiteral("Linked Documents"), QStringLiteral("Deleted Items"),
-                           QStringLiteral("Notebook"), QStringLiteral("document item")}));
+    for (const auto& expected : cases) {
+        List shown;
+        for (const NavListItemData* candidate :
+             {&folder, &note, &qmd, &pdf, &doc, &other, &unknown})
+            if (IsItemVisible(candidate, expected.filter))
+                shown << candidate;
+        EXPECT_EQ(shown, expected.shown) << "case " << &expected - cases;
+    }
 }
 
-TEST_F(ItemModelTest, CanDropRefusesMovesIntoItselfAndIntoLinkedDocuments) {
-    const QString outer = Add(QStringLiteral("folder"), QStringLiteral("root"));
-    const QString inner = Add(QStringLiteral("folder"), outer);
-    const QString note = Add(QStringLiteral("note"), inner);
-    const QString linked = Add(QStringLiteral("document"), QStringLiteral("root"),
-                               {{QStringLiteral("linked"), kTrue}});
-    const QString stored = Add(QStringLiteral("document"), QStringLiteral("root"));
-    const QString linkedSibling = Add(QStringLiteral("document"), QStringLiteral("root"),
-                                      {{QStringLiteral("linked"), kTrue}});
+TEST_F(ItemModelTest, DropsRefuseCyclesSpecialFoldersAndClosedDocumentsIntoLinkedDocuments) {
+    const QString outer = Folder();
+    const QString inner = Folder(outer);
+    const QString note = Add(u"note"_s, inner);
+    const QString linked = Add(u"document"_s, u"root"_s, kLinked);
+    const QString stored = Add(u"document"_s);
+    const QString sibling = Add(u"document"_s, u"root"_s, kLinked);
+    const QString deleted = Add(u"note"_s, outer, kDeleted);
     WNavDS* model = Load();
-    NavListItemData* outerRecord = model->FindItem(outer);
-    NavListItemData* innerRecord = model->FindItem(inner);
-    NavListItemData* siblingRecord = model->FindItem(linkedSibling);
 
-    EXPECT_FALSE(model->CanDrop(outerRecord, outerRecord));
-    EXPECT_FALSE(model->CanDrop(outerRecord, innerRecord));
-    EXPECT_FALSE(model->CanDrop(outerRecord, model->FindItem(note)));
-    EXPECT_TRUE(model->CanDrop(innerRecord, model->GetNotebook()));
-    EXPECT_TRUE(model->CanDrop(model->FindItem(note), outerRecord));
-
-    EXPECT_FALSE(model->CanDrop(model->FindItem(linked), model->GetLinkedDocuments()));
-    EXPECT_TRUE(model->CanDrop(model->FindItem(linked), siblingRecord));
-    EXPECT_FALSE(model->CanDrop(model->FindItem(stored), siblingRecord));
-    EXPECT_FALSE(model->CanDrop(model->FindItem(note), siblingRecord));
-    model->FindItem(stored)->SetOpen(true);
-    EXPECT_FALSE(model->CanDrop(model->FindItem(stored), siblingRecord));
-
+    EXPECT_FALSE(model->CanDrop(Item(outer), Item(outer)));
+    EXPECT_FALSE(model->CanDrop(Item(outer), Item(note)));
+    EXPECT_TRUE(model->CanDrop(Item(note), Item(outer)));
+    EXPECT_TRUE(model->CanDrop(Item(inner), model->GetDeletedItems()));
     for (NavListItemData* special :
          {model->GetNotebook(), model->GetDeletedItems(), model->GetLinkedDocuments()})
-        EXPECT_FALSE(model->CanDrop(special, outerRecord));
-    EXPECT_TRUE(model->CanDrop(innerRecord, model->GetDeletedItems()));
-}
+        EXPECT_FALSE(model->CanDrop(special, Item(outer)));
+    EXPECT_FALSE(model->CanDrop(Item(linked), model->GetLinkedDocuments()));
+    EXPECT_TRUE(model->CanDrop(Item(linked), Item(sibling)));
+    EXPECT_FALSE(model->CanDrop(Item(note), Item(sibling)));
+    EXPECT_FALSE(model->CanDrop(Item(stored), Item(sibling)));
 
-TEST_F(ItemModelTest, SelectionAndDropTargetPredicates) {
-    const QString folder = Add(QStringLiteral("folder"), QStringLiteral("root"));
-    const QString deleted =
-        Add(QStringLiteral("note"), folder, {{QStringLiteral("deleted"), kTrue}});
-    const QString linked = Add(QStringLiteral("document"), QStringLiteral("root"),
-                               {{QStringLiteral("linked"), kTrue}});
-    WNavDS* model = Load();
-
-    EXPECT_FALSE(model->CanEditSelected()); // the Notebook
-    model->SelectById(linked);
-    EXPECT_TRUE(model->IsLinkedDocumentSelected());
-    EXPECT_TRUE(model->CanEditSelected());
-    EXPECT_EQ(model->TopFolderOf(model->GetSelected()), model->GetLinkedDocuments());
-    model->SelectItem(model->GetDeletedItems());
-    EXPECT_TRUE(model->CanEditSelected());
-    EXPECT_TRUE(model->IsSelectedInDeletedItems());
-    model->SelectById(deleted);
-    EXPECT_TRUE(model->IsSelectedInDeletedItems());
-    EXPECT_FALSE(model->IsSelectedOpen());
-
-    model->SetDropTargetById(folder);
-    EXPECT_TRUE(model->IsDropTargetFolder());
+    // Dropped files go into folders only, and never into Linked Documents.
+    model->SetDropTargetById(outer);
     EXPECT_TRUE(model->DropTargetAccepts(true));
     model->SetDropTargetById(deleted);
-    EXPECT_FALSE(model->IsDropTargetFolder());
     EXPECT_FALSE(model->DropTargetAccepts(true));
     EXPECT_TRUE(model->DropTargetAccepts(false));
     model->SetDropTargetById(linked);
@@ -213,50 +130,38 @@ TEST_F(ItemModelTest, SelectionAndDropTargetPredicates) {
 }
 
 TEST_F(ItemModelTest, ImageIndexForEveryKindOfRow) {
-    const QString folder = Add(QStringLiteral("folder"), QStringLiteral("root"));
-    const QString deletedFolder =
-        Add(QStringLiteral("folder"), QStringLiteral("root"), {{QStringLiteral("deleted"), kTrue}});
-    const QString document = Add(QStringLiteral("document"), QStringLiteral("root"));
-    const QString deletedDocument = Add(QStringLiteral("document"), QStringLiteral("root"),
-                                        {{QStringLiteral("deleted"), kTrue}});
-    const QString linked = Add(QStringLiteral("document"), QStringLiteral("root"),
-                               {{QStringLiteral("linked"), kTrue}});
-    const QString deletedLinked =
-        Add(QStringLiteral("document"), QStringLiteral("root"),
-            {{QStringLiteral("linked"), kTrue}, {QStringLiteral("deleted"), kTrue}});
-    const QString note = Add(QStringLiteral("note"), QStringLiteral("root"));
-    const QString deletedNote =
-        Add(QStringLiteral("note"), QStringLiteral("root"), {{QStringLiteral("deleted"), kTrue}});
+    const QString folder = Folder();
+    const QString deletedFolder = Add(u"folder"_s, u"root"_s, kDeleted);
+    const QString document = Add(u"document"_s);
+    const QString deletedDocument = Add(u"document"_s, u"root"_s, kDeleted);
+    const QString linked = Add(u"document"_s, u"root"_s, kLinked);
+    const QString deletedLinked = Add(u"document"_s, u"root"_s, kDeletedLinked);
+    const QString note = Add(u"note"_s);
+    const QString deletedNote = Add(u"note"_s, u"root"_s, kDeleted);
+    const QString untyped = Add(QString());
     WNavDS* model = Load();
-    auto image = [model](const QString& id) { return model->ImageIndexOf(model->FindItem(id)); };
 
-    EXPECT_EQ(model->ImageIndexOf(model->GetLinkedDocuments()), 0);
-    EXPECT_EQ(model->ImageIndexOf(model->GetDeletedItems()), 2);
-    EXPECT_EQ(model->ImageIndexOf(model->GetNotebook()), 18);
-    EXPECT_EQ(image(folder), 4);
-    EXPECT_EQ(image(deletedFolder), 6);
-    EXPECT_EQ(image(document), 8);
-    EXPECT_EQ(image(deletedDocument), 10);
-    EXPECT_EQ(image(linked), 11);
-    EXPECT_EQ(image(deletedLinked), 13);
-    EXPECT_EQ(image(note), 14);
-    EXPECT_EQ(image(deletedNote), 16);
-
-    for (NavListItemData* record :
-         {model->GetLinkedDocuments(), model->GetDeletedItems(), model->GetNotebook(),
-          model->FindItem(folder), model->FindItem(deletedFolder)})
-        record->SetExpanded(!record->IsExpanded());
-    EXPECT_EQ(model->ImageIndexOf(model->GetLinkedDocuments()), 1);
-    EXPECT_EQ(model->ImageIndexOf(model->GetDeletedItems()), 3);
-    EXPECT_EQ(model->ImageIndexOf(model->GetNotebook()), 17);
-    EXPECT_EQ(image(folder), 5);
-    EXPECT_EQ(image(deletedFolder), 7);
-
-    for (const QString& id : {document, linked, note})
-        model->FindItem(id)->SetOpen(true);
-    EXPECT_EQ(image(document), 9);
-    EXPECT_EQ(image(linked), 12);
-    EXPECT_EQ(image(note), 15);
+    // Each row: the record, its image closed and collapsed, and open or expanded.
+    const struct {
+        NavListItemData* record;
+        int image, changed;
+    } rows[] = {
+        {model->GetLinkedDocuments(), 0, 1}, {model->GetDeletedItems(), 2, 3},
+        {model->GetNotebook(), 18, 17},      {Item(folder), 4, 5},
+        {Item(deletedFolder), 6, 7},         {Item(document), 8, 9},
+        {Item(deletedDocument), 10, 10},     {Item(linked), 11, 12},
+        {Item(deletedLinked), 13, 13},       {Item(note), 14, 15},
+        {Item(deletedNote), 16, 16},         {Item(untyped), 4, 4},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.record->GetTitle().toStdString());
+        EXPECT_EQ(model->ImageIndexOf(row.record), row.image);
+        if (row.record->GetKind() == ItemKindFolder || row.record->GetParent() == nullptr)
+            row.record->SetExpanded(!row.record->IsExpanded());
+        else if (!model->IsInDeletedItems(row.record))
+            row.record->SetOpen(true);
+        EXPECT_EQ(model->ImageIndexOf(row.record), row.changed);
+    }
 }
 
 } // namespace

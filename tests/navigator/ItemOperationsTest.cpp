@@ -1,29 +1,12 @@
 #include "NavigatorModelFixture.h"
 
 #include "dataexchange/CBasicStringIDReporter.h"
-#include "libs/toolwell/Formats.h"
 #include "settings/NavigatorSettings.h"
 
 #include <QFile>
 #include <QFileInfo>
 
 namespace {
-
-const QString kTrue = QStringLiteral("true");
-const QString kFalse = QStringLiteral("false");
-const QString kRoot = QStringLiteral("root");
-const QString kFolder = QStringLiteral("folder");
-const QString kNote = QStringLiteral("note");
-const QString kDocument = QStringLiteral("document");
-const QString kOpen = QStringLiteral("open");
-const QString kDeleted = QStringLiteral("deleted");
-const QString kLinked = QStringLiteral("linked");
-
-QString Time(std::int64_t seconds) {
-    QString text;
-    FormatTime(&text, seconds);
-    return text;
-}
 
 class ItemOperationsTest : public NavigatorModelFixture {
 protected:
@@ -34,384 +17,294 @@ protected:
         return children.StringIDs();
     }
     // The records' identifiers in list order, special folders left out.
-    QStringList ListOrder(WNavDS* model) {
+    QStringList ListOrder() {
         QStringList order;
-        for (const auto& record : model->GetItems()) {
+        for (const auto& record : WNavDS::Instance()->GetItems())
             if (record->GetParent() != nullptr)
                 order.append(record->GetItemId());
-        }
         return order;
     }
-    QString LinkedDocument(const QString& path, const QString& accessed, bool deleted = false) {
-        QMap<QString, QString> properties{{kLinked, kTrue},
-                                          {QStringLiteral("path"), path},
-                                          {QStringLiteral("subtype"), QStringLiteral("pdf")},
-                                          {QStringLiteral("dateaccessed"), accessed}};
-        if (deleted)
-            properties.insert(kDeleted, kTrue);
-        return Add(kDocument, kRoot, properties);
-    }
-    QString NewNoteId(WNavDS* model) {
+    QString NewNote() {
         QString id;
         UnicodeStringPtr sink(&id);
-        model->NewNote(nullptr, &sink);
+        WNavDS::Instance()->NewNote(nullptr, &sink);
         return id;
     }
 };
 
-TEST_F(ItemOperationsTest, NewNoteLandsBesideTheSelectionAndOpensInTheNoteTool) {
-    const QString folder = Add(kFolder, kRoot);
-    const QString first = Add(kNote, folder);
-    const QString second = Add(kNote, folder);
-    const QString binned = Add(kNote, kRoot, {{kDeleted, kTrue}});
-    NavigatorSettings::Instance()->SetDefaultFont(QStringLiteral("Verdana"));
+TEST_F(ItemOperationsTest, NewNoteLandsBesideTheSelectionButNeverInDeletedItems) {
+    const QString folder = Folder();
+    const QString first = Add(u"note"_s, folder);
+    const QString second = Add(u"note"_s, folder);
+    const QString binned = Add(u"note"_s, u"root"_s, kDeleted);
     WNavDS* model = Load();
 
     // On a folder: its last child, and the folder opens.
     model->SelectById(folder);
-    const QString inFolder = NewNoteId(model);
+    const QString inFolder = NewNote();
     EXPECT_EQ(Children(folder), QStringList({first, second, inFolder}));
-    EXPECT_EQ(CatalogValue(folder, QStringLiteral("expanded")), kTrue);
-    EXPECT_EQ(model->GetSelected(), model->FindItem(inFolder));
-    EXPECT_EQ(model->FindItem(inFolder)->GetParent(), model->FindItem(folder));
-    EXPECT_EQ(CatalogValue(inFolder, QStringLiteral("font")), QStringLiteral("Verdana"));
-    EXPECT_EQ(CatalogValue(inFolder, QStringLiteral("size")), QStringLiteral("525,400"));
-    EXPECT_EQ(CatalogValue(inFolder, QStringLiteral("filename")), QStringLiteral("note.htm"));
-    ASSERT_EQ(launcher.starts.size(), 1);
-    EXPECT_EQ(launcher.starts[0].arguments.value(0), AppDataFolder() + QStringLiteral("/Catalog/") +
-                                                         inFolder + QStringLiteral("/note.htm"));
-    EXPECT_TRUE(launcher.starts[0].arguments.value(2).contains(QStringLiteral("itemid|") +
-                                                               inFolder + u'|'));
+    EXPECT_EQ(CatalogValue(folder, u"expanded"_s), u"true"_s);
+    EXPECT_EQ(Item(inFolder)->GetParent(), Item(folder));
+    EXPECT_EQ(launcher.starts.value(0).arguments.value(0), ItemFile(inFolder));
 
     // On a note: just before it, in the catalog and in the list.
     model->SelectById(second);
-    const QString beside = NewNoteId(model);
+    const QString beside = NewNote();
     EXPECT_EQ(Children(folder), QStringList({first, beside, second, inFolder}));
-    EXPECT_EQ(ListOrder(model).indexOf(beside) + 1, ListOrder(model).indexOf(second));
+    EXPECT_EQ(ListOrder().indexOf(beside) + 1, ListOrder().indexOf(second));
 
-    // Nothing is made inside Deleted Items: the note goes to the end of the Notebook.
+    // On a deleted item: at the end of the Notebook.
     model->SelectById(binned);
-    const QString top = NewNoteId(model);
-    EXPECT_EQ(Children(kRoot).last(), top);
-    EXPECT_EQ(model->FindItem(top)->GetParent(), model->GetNotebook());
-    EXPECT_EQ(CatalogValue(top, kDeleted), QString());
+    const QString top = NewNote();
+    EXPECT_EQ(Children(u"root"_s).last(), top);
+    EXPECT_EQ(Item(top)->GetParent(), model->GetNotebook());
 }
 
-TEST_F(ItemOperationsTest, NewFolderIsNamedAndAwaitsRenamingOnlyWhenItWasMade) {
+TEST_F(ItemOperationsTest, NewFolderAwaitsRenamingOnlyWhenTheCatalogMadeIt) {
     WNavDS* model = Load();
     QString id;
     UnicodeStringPtr sink(&id);
     model->NewFolder(&sink);
-    ASSERT_NE(model->FindItem(id), nullptr);
-    EXPECT_EQ(model->FindItem(id)->GetTitle(), QStringLiteral("New Folder"));
-    EXPECT_EQ(model->GetSelected(), model->FindItem(id));
+    ASSERT_NE(Item(id), nullptr);
+    EXPECT_EQ(Item(id)->GetTitle(), u"New Folder"_s);
+    EXPECT_EQ(model->GetSelected(), Item(id));
     EXPECT_TRUE(model->IsRenamePending());
 
-    // A catalog that refuses every item: nothing is made, nothing is renamed.
+    // The catalog creates nothing: no record with an empty identifier, nothing to rename.
     model->SetRenamePending(false);
     service->Suspend();
     const std::size_t count = model->GetItems().size();
     model->NewFolder(nullptr);
     EXPECT_FALSE(model->IsRenamePending());
-    auto note = Set({{QStringLiteral("type"), kNote}});
-    EXPECT_EQ(model->AddNewItem(note.get(), 0, nullptr), E_FAIL);
-    auto strange = Set({{QStringLiteral("type"), QStringLiteral("Note")}});
+    EXPECT_EQ(model->AddNewItem(Set({{u"type"_s, u"note"_s}}).get(), 0, nullptr), E_FAIL);
     service->Resume();
-    EXPECT_EQ(model->AddNewItem(strange.get(), 0, nullptr), E_FAIL);
+    EXPECT_EQ(model->AddNewItem(Set({{u"type"_s, u"Note"_s}}).get(), 0, nullptr), E_FAIL);
     EXPECT_EQ(model->GetItems().size(), count);
 }
 
 TEST_F(ItemOperationsTest, LinkingAFileTheCatalogHoldsOpensTheExistingEntry) {
-    const QString file = WriteFile(QStringLiteral("docs/report.pdf"), "%PDF");
+    const QString file = WriteFile(u"docs/report.pdf"_s, "%PDF");
     WNavDS* model = Load();
-
     model->LinkDocument(file, true);
-    ASSERT_EQ(model->GetLinkedDocuments(), model->TopFolderOf(model->GetSelected()));
     NavListItemData* linked = model->GetSelected();
+    ASSERT_EQ(linked->GetParent(), model->GetLinkedDocuments());
     const QString id = linked->GetItemId();
-    EXPECT_TRUE(linked->IsOpen());
-    EXPECT_EQ(CatalogValue(id, QStringLiteral("title")), QStringLiteral("report.pdf"));
-    EXPECT_EQ(CatalogValue(id, QStringLiteral("subtype")), QStringLiteral("pdf"));
-    EXPECT_EQ(launcher.starts.size(), 1);
+    EXPECT_EQ(CatalogValue(id, u"subtype"_s), u"pdf"_s);
 
-    // Another spelling of the same file; it lies in Deleted Items meanwhile.
+    // Another spelling of the same file, while it lies in Deleted Items.
     model->CloseItem(linked);
     model->SelectItem(linked);
     model->DeleteSelected();
     ASSERT_TRUE(model->IsInDeletedItems(linked));
     const std::size_t count = model->GetItems().size();
-    model->LinkDocument(QFileInfo(file).path() + QStringLiteral("/../docs/report.pdf"), true);
+    model->LinkDocument(QFileInfo(file).path() + u"/../docs/report.pdf"_s, true);
     EXPECT_EQ(model->GetItems().size(), count);
-    EXPECT_EQ(linked->GetParent(), model->GetLinkedDocuments());
     EXPECT_TRUE(linked->IsOpen());
-    EXPECT_EQ(launcher.starts.size(), 2);
     // The catalog follows, so the document is still linked, not deleted, after a restart.
-    EXPECT_EQ(CatalogValue(id, kDeleted), kFalse);
+    EXPECT_EQ(CatalogValue(id, u"deleted"_s), u"false"_s);
     model->Load();
-    EXPECT_EQ(model->FindItem(id)->GetParent(), model->GetLinkedDocuments());
+    EXPECT_EQ(Item(id)->GetParent(), model->GetLinkedDocuments());
 
     // Letter case matters to the file system, and other types are not linked at all.
-    model->LinkDocument(QFileInfo(file).path() + QStringLiteral("/REPORT.pdf"), false);
-    EXPECT_EQ(model->GetItems().size(), count + 1);
-    model->LinkDocument(WriteFile(QStringLiteral("docs/notes.txt"), "x"), false);
+    model->LinkDocument(QFileInfo(file).path() + u"/REPORT.pdf"_s, false);
+    model->LinkDocument(WriteFile(u"docs/notes.txt"_s, "x"), false);
     EXPECT_EQ(model->GetItems().size(), count + 1);
 }
 
-TEST_F(ItemOperationsTest, TheLinkedDocumentsLimitKeepsTheMostRecent) {
+TEST_F(ItemOperationsTest, TheLinkedDocumentsLimitKeepsTheMostRecentAndAtLeastOne) {
     NavigatorSettings::Instance()->SetMaxLinkedDocuments(2);
-    const QString t1 = LinkedDocument(QStringLiteral("/d/1.pdf"), Time(1000));
-    const QString t3 = LinkedDocument(QStringLiteral("/d/3.pdf"), Time(3000));
-    const QString t2 = LinkedDocument(QStringLiteral("/d/2.pdf"), Time(2000));
-    const QString binned = LinkedDocument(QStringLiteral("/d/0.pdf"), Time(1), true);
+    const QString t1 = Linked(u"/d/1.pdf"_s, 1000);
+    const QString t3 = Linked(u"/d/3.pdf"_s, 3000);
+    const QString t2 = Linked(u"/d/2.pdf"_s, 2000);
+    const QString binned = Linked(u"/d/0.pdf"_s, 1, true);
     WNavDS* model = Load();
     model->EnforceLinkedLimit();
-    EXPECT_EQ(model->FindItem(t1), nullptr);
-    EXPECT_TRUE(CatalogValue(t1, QStringLiteral("type")).isNull());
-    EXPECT_NE(model->FindItem(t2), nullptr);
-    EXPECT_NE(model->FindItem(t3), nullptr);
-    EXPECT_NE(model->FindItem(binned), nullptr);
+    EXPECT_EQ(Item(t1), nullptr);
+    EXPECT_TRUE(CatalogValue(t1, u"type"_s).isNull());
+    for (const QString& id : {t2, t3, binned})
+        EXPECT_NE(Item(id), nullptr);
 
-    // A newly linked file is the most recent: it stays, the oldest goes, however full the
-    // list was.
-    model->LinkDocument(WriteFile(QStringLiteral("new.pdf"), "%PDF"), false);
-    NavListItemData* fresh = model->GetSelected();
-    ASSERT_NE(fresh, nullptr);
-    EXPECT_EQ(fresh->GetParent(), model->GetLinkedDocuments());
-    EXPECT_EQ(model->FindItem(t2), nullptr);
-    EXPECT_NE(model->FindItem(t3), nullptr);
+    // A newly linked file is the most recent: it stays, and the oldest goes.
+    model->LinkDocument(WriteFile(u"new.pdf"_s, "%PDF"), false);
+    EXPECT_EQ(model->GetSelected()->GetParent(), model->GetLinkedDocuments());
+    EXPECT_EQ(Item(t2), nullptr);
 }
 
-TEST_F(ItemOperationsTest, AmongEqualTimesTheEarlierStaysAndOneAlwaysRemains) {
-    const QString a = LinkedDocument(QStringLiteral("/d/a.pdf"), Time(500));
-    const QString b = LinkedDocument(QStringLiteral("/d/b.pdf"), Time(500));
-    const QString c = LinkedDocument(QStringLiteral("/d/c.pdf"), Time(500));
+TEST_F(ItemOperationsTest, AmongEqualTimesTheEarlierStaysAndALimitOfZeroKeepsOne) {
+    const QString a = Linked(u"/d/a.pdf"_s, 500);
+    const QString b = Linked(u"/d/b.pdf"_s, 500);
+    const QString c = Linked(u"/d/c.pdf"_s, 500);
     NavigatorSettings::Instance()->SetMaxLinkedDocuments(2);
     WNavDS* model = Load();
     model->EnforceLinkedLimit();
-    EXPECT_NE(model->FindItem(a), nullptr);
-    EXPECT_NE(model->FindItem(b), nullptr);
-    EXPECT_EQ(model->FindItem(c), nullptr);
-
+    EXPECT_NE(Item(b), nullptr);
+    EXPECT_EQ(Item(c), nullptr);
     NavigatorSettings::Instance()->SetMaxLinkedDocuments(0);
     model->EnforceLinkedLimit();
-    EXPECT_NE(model->FindItem(a), nullptr);
-    EXPECT_EQ(model->FindItem(b), nullptr);
+    EXPECT_NE(Item(a), nullptr);
+    EXPECT_EQ(Item(b), nullptr);
 }
 
 TEST_F(ItemOperationsTest, DeletingAFolderClosesItsContentsAndRestoreBringsItBack) {
-    const QString parent = Add(kFolder, kRoot);
-    const QString folder = Add(kFolder, parent);
-    const QString inner = Add(kNote, folder);
+    const QString parent = Folder();
+    const QString folder = Folder(parent);
+    const QString inner = Add(u"note"_s, folder);
     WNavDS* model = Load();
-    auto open = Set({{kOpen, kTrue}});
-    model->UpdateItem(inner, open.get(), true);
-    hub.calls.clear();
+    Update(inner, kOpen);
 
     model->SelectById(folder);
     model->DeleteSelected();
-    NavListItemData* record = model->FindItem(folder);
+    NavListItemData* record = Item(folder);
     EXPECT_EQ(record->GetParent(), model->GetDeletedItems());
-    EXPECT_EQ(record->GetRestoreParent(), model->FindItem(parent));
-    EXPECT_EQ(model->GetSelected(), model->FindItem(parent));
-    EXPECT_FALSE(model->FindItem(inner)->IsOpen());
-    EXPECT_TRUE(model->IsInDeletedItems(model->FindItem(inner)));
-    EXPECT_EQ(CatalogValue(folder, kDeleted), kTrue);
-    EXPECT_EQ(CatalogValue(inner, kOpen), kFalse);
-    ASSERT_EQ(hub.calls.size(), 1);
-    EXPECT_EQ(hub.calls[0].properties.value(kOpen), kFalse);
-    // The catalog place does not change.
+    EXPECT_EQ(record->GetRestoreParent(), Item(parent));
+    EXPECT_EQ(model->GetSelected(), Item(parent));
+    EXPECT_EQ(CatalogValue(folder, u"deleted"_s), u"true"_s);
+    EXPECT_EQ(CatalogValue(inner, u"open"_s), u"false"_s);
+    EXPECT_EQ(hub.calls.size(), 1);
     EXPECT_EQ(Children(parent), QStringList({folder}));
 
     model->SelectItem(record);
     model->RestoreSelected();
-    EXPECT_EQ(record->GetParent(), model->FindItem(parent));
-    EXPECT_EQ(record->GetRestoreParent(), nullptr);
-    EXPECT_EQ(CatalogValue(folder, kDeleted), kFalse);
+    EXPECT_EQ(record->GetParent(), Item(parent));
+    EXPECT_EQ(CatalogValue(folder, u"deleted"_s), u"false"_s);
 
-    // An item inside a deleted folder carries no way back of its own: restoring it alone
+    // An item inside a deleted folder has no way back of its own: restoring it alone
     // leaves it where it is instead of losing its parent.
     model->DeleteSelected();
     model->SelectById(inner);
     model->RestoreSelected();
-    EXPECT_EQ(model->FindItem(inner)->GetParent(), record);
+    EXPECT_EQ(Item(inner)->GetParent(), record);
 }
 
 TEST_F(ItemOperationsTest, DeleteInDeletedItemsRemovesForGood) {
-    const QString kept = Add(kNote, kRoot);
-    const QString first = Add(kNote, kRoot, {{kDeleted, kTrue}});
-    const QString folder = Add(kFolder, kRoot, {{kDeleted, kTrue}});
-    const QString inner = Add(kNote, folder);
+    const QString kept = Add(u"note"_s);
+    const QString first = Add(u"note"_s, u"root"_s, kDeleted);
+    const QString folder = Add(u"folder"_s, u"root"_s, kDeleted);
+    const QString inner = Add(u"note"_s, folder);
     WNavDS* model = Load();
 
     // Permanently Delete: only that item, and Deleted Items becomes the selection.
     model->SelectById(first);
     model->DeleteSelected();
-    EXPECT_EQ(model->FindItem(first), nullptr);
-    EXPECT_TRUE(CatalogValue(first, QStringLiteral("type")).isNull());
-    EXPECT_FALSE(QFileInfo::exists(AppDataFolder() + QStringLiteral("/Catalog/") + first));
+    EXPECT_EQ(Item(first), nullptr);
+    EXPECT_FALSE(QFileInfo::exists(AppDataFolder() + u"/Catalog/"_s + first));
     EXPECT_EQ(model->GetSelected(), model->GetDeletedItems());
-    EXPECT_NE(model->FindItem(folder), nullptr);
 
     // Delete on Deleted Items itself empties it, contents of deleted folders included.
     model->DeleteSelected();
-    EXPECT_EQ(model->FindItem(folder), nullptr);
-    EXPECT_EQ(model->FindItem(inner), nullptr);
-    EXPECT_EQ(Children(kRoot), QStringList({kept}));
-    EXPECT_EQ(ListOrder(model), QStringList({kept}));
+    EXPECT_EQ(Item(inner), nullptr);
+    EXPECT_EQ(Children(u"root"_s), QStringList({kept}));
+    EXPECT_EQ(ListOrder(), QStringList({kept}));
 }
 
 TEST_F(ItemOperationsTest, RestoreAllKeepsFolderContentsInTheirFolder) {
-    const QString folder = Add(kFolder, kRoot, {{kDeleted, kTrue}});
-    const QString inner = Add(kNote, folder);
-    const QString alsoDeleted = Add(kNote, folder, {{kDeleted, kTrue}});
-    const QString older = LinkedDocument(QStringLiteral("/d/o.pdf"), Time(100), true);
-    const QString newer = LinkedDocument(QStringLiteral("/d/n.pdf"), Time(200));
+    const QString folder = Add(u"folder"_s, u"root"_s, kDeleted);
+    const QString inner = Add(u"note"_s, folder, kDeleted);
+    const QString older = Linked(u"/d/o.pdf"_s, 100, true);
+    const QString newer = Linked(u"/d/n.pdf"_s, 200);
     NavigatorSettings::Instance()->SetMaxLinkedDocuments(1);
     WNavDS* model = Load();
 
     model->SelectItem(model->GetDeletedItems());
     model->RestoreSelected();
-    EXPECT_EQ(model->FindItem(folder)->GetParent(), model->GetNotebook());
-    EXPECT_EQ(model->FindItem(inner)->GetParent(), model->FindItem(folder));
-    EXPECT_EQ(model->FindItem(alsoDeleted)->GetParent(), model->FindItem(folder));
-    EXPECT_EQ(CatalogValue(alsoDeleted, kDeleted), kFalse);
+    EXPECT_EQ(Item(folder)->GetParent(), model->GetNotebook());
+    EXPECT_EQ(Item(inner)->GetParent(), Item(folder));
+    EXPECT_EQ(CatalogValue(inner, u"deleted"_s), u"false"_s);
     // The restored document joins Linked Documents, which keeps to its limit.
-    EXPECT_EQ(model->FindItem(older), nullptr);
-    EXPECT_NE(model->FindItem(newer), nullptr);
+    EXPECT_EQ(Item(older), nullptr);
+    EXPECT_NE(Item(newer), nullptr);
 }
 
 TEST_F(ItemOperationsTest, SaveToNotebookCopiesTheFileOrKeepsTheDocumentLinked) {
-    const QString file = WriteFile(QStringLiteral("docs/plan.qmd"), "plan text");
-    const QString saved = LinkedDocument(file, Time(100));
-    const QString missing = LinkedDocument(Home() + QStringLiteral("/docs/gone.pdf"), Time(100));
+    const QString saved = Linked(WriteFile(u"docs/plan.qmd"_s, "plan text"), 100);
+    const QString gone = Home() + u"/docs/gone.pdf"_s;
+    const QString missing = Linked(gone, 100);
     WNavDS* model = Load();
 
     model->SelectById(saved);
     model->MoveSelectedTo(nullptr);
-    NavListItemData* record = model->FindItem(saved);
-    EXPECT_EQ(record->GetParent(), model->GetNotebook());
-    EXPECT_FALSE(record->IsLinked());
-    EXPECT_EQ(CatalogValue(saved, kLinked), kFalse);
-    EXPECT_EQ(CatalogValue(saved, QStringLiteral("path")), QString(QStringLiteral("")));
+    EXPECT_EQ(Item(saved)->GetParent(), model->GetNotebook());
+    EXPECT_EQ(CatalogValue(saved, u"linked"_s), u"false"_s);
+    EXPECT_EQ(CatalogValue(saved, u"path"_s), u""_s);
     QString path;
     ASSERT_TRUE(model->GetSelectedDocumentPath(&path));
-    EXPECT_EQ(path,
-              AppDataFolder() + QStringLiteral("/Catalog/") + saved + QStringLiteral("/plan.qmd"));
+    EXPECT_EQ(path, ItemFile(saved, u"plan.qmd"_s));
     QFile copy(path);
     ASSERT_TRUE(copy.open(QIODevice::ReadOnly));
     EXPECT_EQ(copy.readAll(), QByteArray("plan text"));
 
     // No file to copy: the document stays linked, path and all, also after a restart.
     model->MoveById(missing);
-    EXPECT_EQ(model->FindItem(missing)->GetParent(), model->GetLinkedDocuments());
-    EXPECT_EQ(CatalogValue(missing, kLinked), kTrue);
-    EXPECT_EQ(CatalogValue(missing, QStringLiteral("path")),
-              Home() + QStringLiteral("/docs/gone.pdf"));
+    EXPECT_EQ(CatalogValue(missing, u"linked"_s), u"true"_s);
+    EXPECT_EQ(CatalogValue(missing, u"path"_s), gone);
     model->Load();
-    EXPECT_EQ(model->FindItem(missing)->GetParent(), model->GetLinkedDocuments());
-    EXPECT_EQ(model->FindItem(saved)->GetParent(), model->GetNotebook());
+    EXPECT_EQ(Item(missing)->GetParent(), model->GetLinkedDocuments());
 }
 
-TEST_F(ItemOperationsTest, MovesThatCanDropRefusesChangeNothing) {
-    const QString outer = Add(kFolder, kRoot);
-    const QString inner = Add(kFolder, outer);
-    const QString note = Add(kNote, kRoot);
+TEST_F(ItemOperationsTest, MovesKeepCatalogAndListInStepAndRefusedOnesChangeNothing) {
+    const QString a = Folder();
+    const QString aNote = Add(u"note"_s, a);
+    const QString b = Folder();
+    const QString bNote = Add(u"note"_s, b);
+    const QString binned = Add(u"note"_s, u"root"_s, kDeleted);
     WNavDS* model = Load();
-    const QStringList order = ListOrder(model);
 
-    model->MoveItemTo(model->FindItem(outer), model->FindItem(inner));
-    model->MoveItemTo(model->FindItem(note), model->GetLinkedDocuments());
-    model->MoveItemTo(model->GetNotebook(), model->FindItem(outer));
-    // An identifier from outside that names a special folder.
+    // Refused: into its own subtree, into Linked Documents, a special folder, by outside id.
+    const QStringList order = ListOrder();
+    model->MoveItemTo(Item(a), Item(aNote));
+    model->MoveItemTo(Item(aNote), model->GetLinkedDocuments());
+    model->MoveItemTo(model->GetNotebook(), Item(a));
     model->MoveById(model->GetDeletedItems()->GetItemId());
     model->MoveById(model->GetLinkedDocuments()->GetItemId());
-
-    EXPECT_EQ(Children(kRoot), QStringList({outer, note}));
-    EXPECT_EQ(Children(outer), QStringList({inner}));
-    EXPECT_EQ(ListOrder(model), order);
-    EXPECT_EQ(model->FindItem(outer)->GetParent(), model->GetNotebook());
-    EXPECT_EQ(model->GetDeletedItems()->GetParent(), nullptr);
-    EXPECT_EQ(model->GetLinkedDocuments()->GetParent(), nullptr);
-}
-
-TEST_F(ItemOperationsTest, MovesKeepCatalogRecordsAndListInStep) {
-    const QString a = Add(kFolder, kRoot);
-    const QString aNote = Add(kNote, a);
-    const QString b = Add(kFolder, kRoot);
-    const QString bNote = Add(kNote, b);
-    const QString binned = Add(kNote, kRoot, {{kDeleted, kTrue}});
-    WNavDS* model = Load();
+    EXPECT_EQ(ListOrder(), order);
+    EXPECT_EQ(Children(a), QStringList({aNote}));
 
     // A folder goes with its contents, before the sibling it is dropped on.
-    model->MoveItemTo(model->FindItem(b), model->FindItem(aNote));
+    model->MoveItemTo(Item(b), Item(aNote));
     EXPECT_EQ(Children(a), QStringList({b, aNote}));
-    EXPECT_EQ(ListOrder(model).mid(0, 4), QStringList({a, b, bNote, aNote}));
+    EXPECT_EQ(ListOrder().mid(0, 4), QStringList({a, b, bNote, aNote}));
 
     // Out of Deleted Items onto a folder: the catalog takes the new place too.
-    model->MoveItemTo(model->FindItem(binned), model->FindItem(b));
+    model->MoveItemTo(Item(binned), Item(b));
     EXPECT_EQ(Children(b), QStringList({bNote, binned}));
-    EXPECT_EQ(CatalogValue(binned, kDeleted), kFalse);
+    EXPECT_EQ(CatalogValue(binned, u"deleted"_s), u"false"_s);
     model->Load();
-    EXPECT_EQ(model->FindItem(binned)->GetParent(), model->FindItem(b));
+    EXPECT_EQ(Item(binned)->GetParent(), Item(b));
 
     // Into Deleted Items the catalog place stays; dropping it there again keeps its way back.
-    model->MoveItemTo(model->FindItem(binned), model->GetDeletedItems());
-    NavListItemData* record = model->FindItem(binned);
-    EXPECT_EQ(record->GetRestoreParent(), model->FindItem(b));
-    model->MoveItemTo(record, model->GetDeletedItems());
-    EXPECT_EQ(record->GetRestoreParent(), model->FindItem(b));
+    model->MoveItemTo(Item(binned), model->GetDeletedItems());
+    model->MoveItemTo(Item(binned), model->GetDeletedItems());
+    EXPECT_EQ(Item(binned)->GetRestoreParent(), Item(b));
     EXPECT_EQ(Children(b), QStringList({bNote, binned}));
-}
-
-TEST_F(ItemOperationsTest, FilterChoicesRefreshTheTreeOnlyWhenTheyChange) {
-    WNavDS* model = Load();
-    NavigatorSettings* settings = NavigatorSettings::Instance();
-    model->SetChanged(false);
-    settings->SaveIfDirty();
-
-    model->ChooseTypeFilter(WNavDS::TypeFilter::All);
-    EXPECT_FALSE(model->IsChanged());
-    EXPECT_FALSE(settings->IsDirty());
-
-    model->ChooseTypeFilter(WNavDS::TypeFilter::Pdf);
-    EXPECT_TRUE(model->IsChanged());
-    EXPECT_TRUE(model->IsTypeFilterChosen(WNavDS::TypeFilter::Pdf));
-    EXPECT_FALSE(model->IsTypeFilterChosen(WNavDS::TypeFilter::All));
-
-    model->SetChanged(false);
-    model->ToggleOpenedItemsOnly();
-    EXPECT_TRUE(model->IsOpenedItemsOnly());
-    EXPECT_TRUE(model->IsChanged());
-    model->ToggleOpenedItemsOnly();
-    EXPECT_FALSE(model->IsOpenedItemsOnly());
 }
 
 TEST_F(ItemOperationsTest, CommandsAreEnabledFromTheSelection) {
-    const QString folder = Add(kFolder, kRoot);
-    const QString note = Add(kNote, folder);
-    const QString binnedNote = Add(kNote, kRoot, {{kDeleted, kTrue}});
-    const QString linked = LinkedDocument(QStringLiteral("/d/x.pdf"), Time(1));
+    const QString folder = Folder();
+    const QString note = Add(u"note"_s, folder);
+    const QString binnedNote = Add(u"note"_s, u"root"_s, kDeleted);
+    const QString linked = Linked(u"/d/x.pdf"_s, 1);
     WNavDS* model = Load();
 
-    struct Expected {
+    const struct {
         NavListItemData* selection;
-        bool rename, print, wordProcessor, blog;
+        bool edit, rename, print, wordProcessor, blog, inDeleted;
+    } cases[] = {
+        {model->GetNotebook(), false, false, false, true, false, false},
+        {model->GetLinkedDocuments(), false, true, false, false, false, false},
+        {Item(folder), true, true, false, true, false, false},
+        {Item(note), true, true, true, true, true, false},
+        {Item(binnedNote), true, true, true, false, false, true},
+        {Item(linked), true, false, true, false, false, false},
     };
-    const QList<Expected> cases{
-        {model->GetNotebook(), false, false, true, false},
-        {model->GetLinkedDocuments(), true, false, false, false},
-        {model->FindItem(folder), true, false, true, false},
-        {model->FindItem(note), true, true, true, true},
-        {model->FindItem(binnedNote), true, true, false, false},
-        {model->FindItem(linked), false, true, false, false},
-    };
-    for (const Expected& expected : cases) {
+    for (const auto& expected : cases) {
         model->SelectItem(expected.selection);
         SCOPED_TRACE(expected.selection->GetTitle().toStdString());
+        EXPECT_EQ(model->CanEditSelected(), expected.edit);
         EXPECT_EQ(model->CanRenameSelected(), expected.rename);
         EXPECT_EQ(model->CanPrintSelected(), expected.print);
         EXPECT_EQ(model->CanSendSelectedToWordProcessor(), expected.wordProcessor);
         EXPECT_EQ(model->CanBlogSelected(), expected.blog);
+        EXPECT_EQ(model->IsSelectedInDeletedItems(), expected.inDeleted);
     }
 }
 

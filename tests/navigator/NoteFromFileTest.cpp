@@ -2,123 +2,87 @@
 
 #include "notes/CBasicNoteConstructor.h"
 #include "notes/NoteConstructorRegistry.h"
-#include "support/RecordingMessageBox.h"
 
 #include <QDir>
 #include <QFile>
-#include <QFileInfo>
 
 namespace {
 
 class NoteFromFileTest : public NavigatorModelFixture {
 protected:
-    void SetUp() override {
-        NavigatorModelFixture::SetUp();
-        Platform::SetMessageBox(&messages);
-    }
-
-    QString NoteFile(const QString& itemId) const {
-        return AppDataFolder() + QStringLiteral("/Catalog/") + itemId + QStringLiteral("/note.htm");
-    }
-
     QByteArray Read(const QString& path) const {
         QFile file(path);
         return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
     }
-
-    RecordingMessageBox messages;
+    QStringList ItemFolders() const {
+        return QDir(AppDataFolder() + u"/Catalog"_s).entryList(QDir::Dirs | QDir::NoDotAndDotDot);
+    }
 };
 
 TEST_F(NoteFromFileTest, ATextFileBecomesAnOpenNoteAndIsThenRemoved) {
-    const QString folder = Add(QStringLiteral("folder"), QStringLiteral("root"));
+    const QString folder = Folder();
     WNavDS* model = Load();
-    model->SelectItem(model->FindItem(folder));
-    const QString source = WriteFile(QStringLiteral("in/clip.txt"), "a<b & c");
+    model->SelectItem(Item(folder));
+    const QString source = WriteFile(u"in/clip.txt"_s, "a<b & c");
 
     QString itemId;
     UnicodeStringPtr idSink(&itemId);
     ASSERT_EQ(model->AddNoteFromFile(source, &idSink), S_OK);
-
     EXPECT_FALSE(QFile::exists(source));
-    ASSERT_NE(model->FindItem(itemId), nullptr);
-    EXPECT_EQ(model->FindItem(itemId)->GetParent(), model->FindItem(folder));
-    EXPECT_EQ(CatalogValue(itemId, QStringLiteral("type")), QStringLiteral("note"));
-    EXPECT_EQ(CatalogValue(itemId, QStringLiteral("open")), QStringLiteral("true"));
-    EXPECT_EQ(CatalogValue(itemId, QStringLiteral("font")), QStringLiteral("Times New Roman"));
-    EXPECT_EQ(CatalogValue(itemId, QStringLiteral("size")), QStringLiteral("525,400"));
+    EXPECT_EQ(Item(itemId)->GetParent(), Item(folder));
+    EXPECT_EQ(CatalogValue(itemId, u"open"_s), u"true"_s);
     // Handed-over text is not preformatted, and it stays text.
-    const QByteArray note = Read(NoteFile(itemId));
+    const QByteArray note = Read(ItemFile(itemId));
     EXPECT_TRUE(note.contains("<BODY><DIV>a&lt;b &amp; c</DIV></BODY></HTML>"));
-    EXPECT_TRUE(note.endsWith('\0'));
-
-    // The note tool was started on the note with its properties.
-    ASSERT_FALSE(launcher.starts.isEmpty());
-    const auto& start = launcher.starts.last();
-    EXPECT_TRUE(start.program.endsWith(QStringLiteral("/AmbrelNoteTool")));
-    ASSERT_GE(start.arguments.size(), 3);
-    EXPECT_EQ(start.arguments.at(0), NoteFile(itemId));
-    EXPECT_EQ(start.arguments.at(1), QStringLiteral("/PROPERTY"));
-    EXPECT_TRUE(start.arguments.at(2).contains(QStringLiteral("itemid|") + itemId + u'|'));
-    EXPECT_TRUE(messages.shown.isEmpty());
+    EXPECT_EQ(launcher.starts.value(0).arguments.value(0), ItemFile(itemId));
 }
 
 TEST_F(NoteFromFileTest, AFileThatCannotBecomeANoteIsKeptAndLeavesNothingBehind) {
-    const QString folder = Add(QStringLiteral("folder"), QStringLiteral("root"));
+    const QString folder = Folder();
     WNavDS* model = Load();
-    NavListItemData* selected = model->FindItem(folder);
-    model->SelectItem(selected);
+    model->SelectItem(Item(folder));
     const qsizetype records = model->GetItems().size();
-    const QStringList itemFolders = QDir(AppDataFolder() + QStringLiteral("/Catalog"))
-                                        .entryList(QDir::Dirs | QDir::NoDotAndDotDot);
+    const QStringList itemFolders = ItemFolders();
 
     // Three bytes are too short to be a note.
-    const QString source = WriteFile(QStringLiteral("in/abc.txt"), "abc");
+    const QString source = WriteFile(u"in/abc.txt"_s, "abc");
     EXPECT_EQ(model->AddNoteFromFile(source, nullptr), E_FAIL);
-
     EXPECT_TRUE(QFile::exists(source)) << "the user's file is lost";
     EXPECT_EQ(model->GetItems().size(), records);
-    EXPECT_EQ(model->GetSelected(), selected);
-    EXPECT_EQ(QDir(AppDataFolder() + QStringLiteral("/Catalog"))
-                  .entryList(QDir::Dirs | QDir::NoDotAndDotDot),
-              itemFolders);
+    EXPECT_EQ(model->GetSelected(), Item(folder));
+    EXPECT_EQ(ItemFolders(), itemFolders);
     ASSERT_EQ(messages.shown.size(), 1);
-    EXPECT_EQ(messages.shown.first().text,
-              QStringLiteral("Quillmark Ambrel was not able to open the file abc.txt\nThe file "
-                             "may contain invalid characters."));
-    EXPECT_EQ(messages.shown.first().caption, QStringLiteral("Quillmark Ambrel"));
-    EXPECT_TRUE(launcher.starts.isEmpty());
+    EXPECT_EQ(messages.shown[0].text, u"Quillmark Ambrel was not able to open the file abc.txt\n"
+                                      u"The file may contain invalid characters."_s);
+    EXPECT_EQ(messages.shown[0].caption, u"Quillmark Ambrel"_s);
 
     // A file no constructor takes makes no item and no message, and stays.
-    const QString page = WriteFile(QStringLiteral("in/page.htm"), "<p>hello</p>");
+    const QString page = WriteFile(u"in/page.htm"_s, "<p>hello</p>");
     EXPECT_EQ(model->AddNoteFromFile(page, nullptr), E_FAIL);
     EXPECT_TRUE(QFile::exists(page));
-    EXPECT_EQ(model->GetItems().size(), records);
     EXPECT_EQ(messages.shown.size(), 1);
 }
 
-TEST_F(NoteFromFileTest, ADroppedPictureLandsOnTheDropTargetUnopened) {
-    const QString folder = Add(QStringLiteral("folder"), QStringLiteral("root"));
-    const QString other = Add(QStringLiteral("folder"), QStringLiteral("root"));
+TEST_F(NoteFromFileTest, ADroppedPictureLandsOnTheDropTargetUnopenedAndTheFileStays) {
+    const QString folder = Folder();
+    const QString other = Folder();
     WNavDS* model = Load();
-    model->SelectItem(model->FindItem(other));
-    model->SetDropTarget(model->FindItem(folder));
-    const QString picture = WriteFile(QStringLiteral("in/photo.png"), "not really a png");
+    model->SelectItem(Item(other));
+    model->SetDropTarget(Item(folder));
+    const QString picture = WriteFile(u"in/photo.png"_s, "not really a png");
 
     ReleasePtr<CBasicNoteConstructor> constructor(CreateNoteConstructor(picture));
     ASSERT_TRUE(constructor);
     QString itemId;
     UnicodeStringPtr idSink(&itemId);
-    ASSERT_EQ(model->AddNoteFromConstructor(QStringLiteral("photo.png"), constructor.get(), 0, 2,
-                                            &idSink),
+    ASSERT_EQ(model->AddNoteFromConstructor(u"photo.png"_s, constructor.get(), 0, 2, &idSink),
               S_OK);
-    EXPECT_EQ(model->FindItem(itemId)->GetParent(), model->FindItem(folder));
-    EXPECT_EQ(CatalogValue(itemId, QStringLiteral("title")), QStringLiteral("photo.png"));
-    EXPECT_EQ(CatalogValue(itemId, QStringLiteral("open")), QStringLiteral("false"));
-    EXPECT_TRUE(QFile::exists(picture)) << "a dropped file is the user's";
-    EXPECT_TRUE(QFileInfo::exists(AppDataFolder() + QStringLiteral("/Catalog/") + itemId +
-                                  QStringLiteral("/photo.png")));
-    EXPECT_TRUE(Read(NoteFile(itemId)).contains("photo.png"));
-    EXPECT_TRUE(launcher.starts.isEmpty()) << "an unopened note starts no note tool";
+    EXPECT_EQ(Item(itemId)->GetParent(), Item(folder));
+    EXPECT_EQ(CatalogValue(itemId, u"open"_s), u"false"_s);
+    EXPECT_TRUE(QFile::exists(picture));
+    EXPECT_TRUE(QFile::exists(ItemFile(itemId, u"photo.png"_s)));
+    EXPECT_TRUE(Read(ItemFile(itemId)).contains("photo.png"));
+    EXPECT_TRUE(launcher.starts.isEmpty());
 }
 
 } // namespace
