@@ -9,8 +9,12 @@
 
 #include <QApplication>
 #include <QFile>
+#include <QStringDecoder>
+#include <QStringEncoder>
 
 namespace {
+
+using namespace Qt::StringLiterals;
 
 // A utility engine whose readiness the test chooses.
 class FakeHarborUtils final : public IHarborUtils {
@@ -36,23 +40,21 @@ public:
 
 class NavigatorAppTest : public AmbrelTest {
 protected:
-    // A settings file holding just these pipe-delimited pairs, as UTF-16 little-endian.
-    void WriteSettings(const QString& pairs) {
-        QByteArray bytes;
-        for (const QChar c : pairs) {
-            bytes.append(static_cast<char>(c.unicode() & 0xFF));
-            bytes.append(static_cast<char>(c.unicode() >> 8));
-        }
-        WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/NavSettings.dat"), bytes);
+    // A file in the application data folder.
+    QByteArray Read(const QString& name) const {
+        QFile file(AppDataFolder() + u'/' + name);
+        return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+    }
+    QString ReadSettings() const {
+        return QStringDecoder(QStringConverter::Utf16LE).decode(Read(u"NavSettings.dat"_s));
     }
 
-    QString ReadSettings() const {
-        QFile file(AppDataFolder() + QStringLiteral("/NavSettings.dat"));
-        if (!file.open(QIODevice::ReadOnly))
-            return {};
-        const QByteArray bytes = file.readAll();
-        return QString::fromUtf16(reinterpret_cast<const char16_t*>(bytes.constData()),
-                                  bytes.size() / 2);
+    static void StartAndEnd() {
+        CNavigatorApp app({u"ambrel-navigator"_s});
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        delete app.MainWindow();
+        EXPECT_EQ(app.ExitInstance(), 0);
     }
 };
 
@@ -63,7 +65,7 @@ TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
         utils.enabled = false; // also covers IsEnabled when ready
         SetHarborUtilsForTesting(&utils);
 
-        CNavigatorApp app({QStringLiteral("ambrel-navigator")});
+        CNavigatorApp app({u"ambrel-navigator"_s});
         EXPECT_EQ(app.Run(), 0);
         EXPECT_EQ(app.MainWindow(), nullptr) << "no window may be left behind";
         EXPECT_TRUE(QApplication::topLevelWidgets().isEmpty());
@@ -73,44 +75,33 @@ TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
     }
 }
 
-TEST_F(NavigatorAppTest, StartUpShowsTheWindowAtItsDefaultPlace) {
-    FakeHarborUtils utils;
-    SetHarborUtilsForTesting(&utils);
-    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
-    ASSERT_TRUE(app.InitInstance());
-    ASSERT_NE(app.MainWindow(), nullptr);
-    EXPECT_TRUE(app.MainWindow()->isVisible());
-    EXPECT_EQ(app.MainWindow()->frameGeometry().topLeft(), QPoint(0, 0));
-    EXPECT_EQ(app.MainWindow()->size(), QSize(280, 650));
-    EXPECT_EQ(utils.shuttingDownCalls, QList<bool>{false});
-
-    // With the window gone the next idle pass ends the program.
-    delete app.MainWindow();
-    EXPECT_FALSE(app.OnIdle(0));
-    EXPECT_EQ(app.ExitInstance(), 0);
-    EXPECT_NE(GetHarborUtilsInterface(), &utils);
-}
-
-TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlace) {
-    WriteSettings(QStringLiteral("applicationposition|100,50,400,300|"));
-    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
-    ASSERT_TRUE(app.InitInstance());
-    EXPECT_EQ(app.MainWindow()->geometry(), QRect(100, 50, 400, 300));
-    delete app.MainWindow();
-    app.ExitInstance();
-}
-
-TEST_F(NavigatorAppTest, AStoredWidthOfZeroKeepsTheDefaultWidthButNotThePlace) {
-    WriteSettings(QStringLiteral("applicationposition|30,40,0,500|"));
-    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
-    ASSERT_TRUE(app.InitInstance());
-    EXPECT_EQ(app.MainWindow()->geometry(), QRect(30, 40, 280, 500));
-    delete app.MainWindow();
-    app.ExitInstance();
+TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOne) {
+    const std::pair<const char16_t*, QRect> cases[] = {
+        {nullptr, {0, 0, 280, 650}},
+        {u"applicationposition|100,50,400,300|", {100, 50, 400, 300}},
+        // A stored width of 0 keeps the default width, not the default place.
+        {u"applicationposition|30,40,0,500|", {30, 40, 280, 500}},
+    };
+    for (const auto& [stored, expected] : cases) {
+        if (stored)
+            WriteFile(u"data/Brindle/Quillmark Ambrel/NavSettings.dat"_s,
+                      QStringEncoder(QStringConverter::Utf16LE).encode(QString::fromUtf16(stored)));
+        CNavigatorApp app({u"ambrel-navigator"_s});
+        ASSERT_TRUE(app.InitInstance());
+        QWidget* window = app.MainWindow();
+        EXPECT_TRUE(window->isVisible());
+        // By default the frame goes in the corner; a stored place is the window's inside it.
+        const QPoint place =
+            stored ? window->geometry().topLeft() : window->frameGeometry().topLeft();
+        EXPECT_EQ(QRect(place, window->size()), expected);
+        delete window;
+        app.ExitInstance();
+        ResetSingletons();
+    }
 }
 
 TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
-    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
+    CNavigatorApp app({u"ambrel-navigator"_s});
     ASSERT_TRUE(app.InitInstance());
     NavigatorSettings* settings = NavigatorSettings::Instance();
     EXPECT_TRUE(app.OnIdle(0)) << "the first pass asks for one more";
@@ -122,41 +113,24 @@ TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
     EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 420, 680}));
     app.OnIdle(0);
     EXPECT_FALSE(settings->IsDirty());
-
-    EXPECT_TRUE(ReadSettings().startsWith(QStringLiteral("applicationposition|120,80,300,600|")))
-        << ReadSettings().toStdString();
+    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|120,80,300,600|"_s));
 
     // A change after the last idle pass still reaches the file at shut-down.
     settings->SetKeepOnTop(true);
     delete app.MainWindow();
     app.ExitInstance();
-    EXPECT_TRUE(ReadSettings().contains(QStringLiteral("|keepontop|true|")));
+    EXPECT_TRUE(ReadSettings().contains(u"|keepontop|true|"_s));
 }
 
 TEST_F(NavigatorAppTest, AFreshStartMakesTheCatalogAndABrokenOneIsLeftAlone) {
-    const QString catalog = AppDataFolder() + QStringLiteral("/Catalog/catalog.xml");
-    {
-        CNavigatorApp app({QStringLiteral("ambrel-navigator")});
-        ASSERT_TRUE(app.InitInstance());
-        delete app.MainWindow();
-        app.ExitInstance();
-    }
-    QFile made(catalog);
-    ASSERT_TRUE(made.open(QIODevice::ReadOnly));
-    EXPECT_TRUE(made.readAll().startsWith("\xFF\xFE<\0?\0x\0m\0l\0"));
+    StartAndEnd();
+    EXPECT_TRUE(
+        Read(u"Catalog/catalog.xml"_s).startsWith(QByteArrayLiteral("\xFF\xFE<\0?\0x\0m\0l\0")));
 
     const QByteArray broken = "<?xml version=\"1.0\"?><archive><items><item uuid=\"root\"";
-    WriteFile(QStringLiteral("data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"), broken);
-    {
-        CNavigatorApp app({QStringLiteral("ambrel-navigator")});
-        ASSERT_TRUE(app.InitInstance());
-        app.OnIdle(0);
-        delete app.MainWindow();
-        app.ExitInstance();
-    }
-    QFile kept(catalog);
-    ASSERT_TRUE(kept.open(QIODevice::ReadOnly));
-    EXPECT_EQ(kept.readAll(), broken);
+    WriteFile(u"data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"_s, broken);
+    StartAndEnd();
+    EXPECT_EQ(Read(u"Catalog/catalog.xml"_s), broken);
 }
 
 TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
@@ -164,11 +138,12 @@ TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
     Platform::SetProcessLauncher(&launcher);
     FakeHarborUtils utils;
     SetHarborUtilsForTesting(&utils);
-    CNavigatorApp app({QStringLiteral("ambrel-navigator")});
+    CNavigatorApp app({u"ambrel-navigator"_s});
     ASSERT_TRUE(app.InitInstance());
-    QString noteId;
-    UnicodeStringPtr idSink(&noteId);
-    WNavDS::Instance()->NewNote(nullptr, &idSink);
+    QString text;
+    UnicodeStringPtr sink(&text);
+    WNavDS::Instance()->NewNote(nullptr, &sink);
+    const QString noteId = text;
     ASSERT_TRUE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
     ASSERT_EQ(launcher.starts.size(), 1) << "the note tool was not started";
 
@@ -176,10 +151,8 @@ TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
     EXPECT_FALSE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
     ReleasePtr<DataExchange::IProperties> properties(DataExchange::CreateProperties());
     ASSERT_EQ(GetDataStoreService()->GetProperties(noteId, properties.get()), S_OK);
-    QString open;
-    UnicodeStringPtr openSink(&open);
-    properties->GetProperty(QStringLiteral("open"), &openSink);
-    EXPECT_EQ(open, QStringLiteral("false"));
+    properties->GetProperty(u"open"_s, &sink);
+    EXPECT_EQ(text, u"false"_s) << "the catalog still has the note open";
     EXPECT_EQ(utils.shuttingDownCalls, (QList<bool>{false, true}));
     app.ExitInstance();
 }

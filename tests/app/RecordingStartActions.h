@@ -4,21 +4,20 @@
 
 #include <QStringList>
 
-// Writes down every start action it is asked for, in order.
+// Writes down every start action it is asked for, in order: "Name" or "Name(argument)".
 class RecordingStartActions final : public IStartActions {
 public:
-    void NewNote() override { calls.append(QStringLiteral("NewNote")); }
-    void OpenDocument() override { calls.append(QStringLiteral("OpenDocument")); }
-    void ViewDocument(const QString& path) override {
-        calls.append(QStringLiteral("ViewDocument(%1)").arg(path));
-    }
-    void NewNoteFromFile(const QString& path) override {
-        calls.append(QStringLiteral("NewNoteFromFile(%1)").arg(path));
-    }
-    void SnapshotToNewNote() override { calls.append(QStringLiteral("SnapshotToNewNote")); }
-    void OpenRecentItem(const QString& identifier) override {
-        calls.append(QStringLiteral("OpenRecentItem(%1)").arg(identifier));
-    }
+    void NewNote() override { calls << QStringLiteral("NewNote"); }
+    void OpenDocument() override { calls << QStringLiteral("OpenDocument"); }
+    void ViewDocument(const QString& path) override { Add(u"ViewDocument", path); }
+    void NewNoteFromFile(const QString& path) override { Add(u"NewNoteFromFile", path); }
+    void SnapshotToNewNote() override { calls << QStringLiteral("SnapshotToNewNote"); }
+    void OpenRecentItem(const QString& id) override { Add(u"OpenRecentItem", id); }
 
     QStringList calls;
+
+private:
+    void Add(const char16_t* name, const QString& argument) {
+        calls << QString::fromUtf16(name) + u'(' + argument + u')';
+    }
 };

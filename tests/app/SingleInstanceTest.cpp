@@ -6,7 +6,6 @@
 #include "app/SingleInstance.h"
 
 #include <QFile>
-#include <QThread>
 
 #include <atomic>
 #include <future>
@@ -14,35 +13,25 @@
 namespace {
 
 using namespace std::chrono_literals;
+using namespace Qt::StringLiterals;
 using Outcome = SingleInstance::Outcome;
 
-const QString kName = QStringLiteral("AmbrelNavigator-1.0.0.521-:0-me");
-
-// Runs a start in a thread of its own, as it would run in a process of its own.
-template <class Start> auto InOwnThread(Start start) {
-    auto promise = std::make_shared<std::promise<decltype(start())>>();
-    auto future = promise->get_future();
-    QThread* thread = QThread::create([promise, start] { promise->set_value(start()); });
-    QObject::connect(thread, &QThread::finished, thread, &QObject::deleteLater);
-    thread->start();
-    return future;
-}
+const QString kName = u"AmbrelNavigator-1.0.0.521-:0-me"_s;
 
 class SingleInstanceTest : public AmbrelTest {
 protected:
     QString SocketPath() const { return RuntimeHome() + u'/' + kName; }
-    QString LockPath() const { return SocketPath() + QStringLiteral("-StartupMutex"); }
 
-    // A later start while this thread runs the event loop of the navigator under test.
-    struct LaterStart {
-        Outcome outcome;
-        bool handledBeforeItEnded;
-    };
-    LaterStart StartAnother(const QStringList& arguments, std::chrono::milliseconds patience) {
-        auto later = InOwnThread([=, this] {
+    // A later start while this thread runs the event loop of the navigator under test; answers
+    // its outcome and whether the navigator had run its actions before it ended.
+    std::pair<Outcome, bool> StartAnother(const QStringList& arguments,
+                                          std::chrono::milliseconds patience = 10s) {
+        m_handlerReturned = false;
+        // In a thread of its own, as it would run in a process of its own.
+        auto later = std::async(std::launch::async, [=, this] {
             SingleInstance instance(kName);
             const Outcome outcome = instance.Start(arguments, patience);
-            return LaterStart{outcome, m_handlerReturned.load()};
+            return std::pair{outcome, m_handlerReturned.load()};
         });
         EXPECT_TRUE(SpinUntil([&] { return later.wait_for(0s) == std::future_status::ready; }));
         return later.get();
@@ -60,102 +49,49 @@ protected:
     std::atomic<bool> m_handlerReturned{false};
 };
 
-TEST(InstanceNameTest, NamesVersionDesktopAndUserWhereKnown) {
-    EXPECT_EQ(SingleInstance::InstanceName(QStringLiteral(":0"), QStringLiteral("me")),
-              QStringLiteral("AmbrelNavigator-1.0.0.521-:0-me"));
-    EXPECT_EQ(SingleInstance::InstanceName(QString(), QStringLiteral("me")),
-              QStringLiteral("AmbrelNavigator-1.0.0.521-me"));
-    EXPECT_EQ(SingleInstance::InstanceName(QString(), QString()),
-              QStringLiteral("AmbrelNavigator-1.0.0.521"));
+TEST(InstanceNameTest, NamesVersionDesktopAndUserAsOneFileName) {
+    EXPECT_EQ(SingleInstance::InstanceName(u":0"_s, u"me"_s), kName);
     // A display given as a path must not turn the name into a path.
-    EXPECT_EQ(SingleInstance::InstanceName(QStringLiteral("/run/user/1000/wayland-0"),
-                                           QStringLiteral("a%2Fb")),
-              QStringLiteral("AmbrelNavigator-1.0.0.521-%2Frun%2Fuser%2F1000%2Fwayland-0-a%252Fb"));
+    EXPECT_EQ(SingleInstance::InstanceName(u"/run/user/1000/wayland-0"_s, u"a%2Fb"_s),
+              u"AmbrelNavigator-1.0.0.521-%2Frun%2Fuser%2F1000%2Fwayland-0-a%252Fb"_s);
 }
 
-TEST_F(SingleInstanceTest, ASecondStartHandsOverAndEndsAfterTheActionsRan) {
+TEST_F(SingleInstanceTest, ASecondStartHandsOverOnceTheNavigatorAnswersAndEndsAfterItsActions) {
     SingleInstance running(kName);
-    ASSERT_EQ(running.Start({QStringLiteral("ambrel-navigator")}), Outcome::Running);
+    ASSERT_EQ(running.Start({u"ambrel-navigator"_s}), Outcome::Running);
     EXPECT_TRUE(running.HoldsLock());
-    EXPECT_TRUE(QFile::exists(SocketPath()));
-    PublishTo(running);
+    EXPECT_EQ(StartAnother({u"prog"_s, u"/NewNote"_s}, 300ms).first, Outcome::NoAnswer);
 
     // The lock is still held by the running navigator's start-up: the later start gets through
     // on the socket all the same.
-    const LaterStart later =
-        StartAnother({QStringLiteral("/usr/bin/ambrel-navigator"), QStringLiteral("/ViewDocument"),
-                      QStringLiteral("/home/me/My Notes/a b.pdf")},
-                     SingleInstance::kPatience);
-    EXPECT_EQ(later.outcome, Outcome::HandedOver);
-    EXPECT_TRUE(later.handledBeforeItEnded);
-    EXPECT_EQ(m_actions.calls,
-              QStringList{QStringLiteral("ViewDocument(/home/me/My Notes/a b.pdf)")});
+    PublishTo(running);
+    EXPECT_EQ(StartAnother({u"/usr/bin/ambrel-navigator"_s, u"/ViewDocument"_s,
+                            u"/home/me/My Notes/a b.pdf"_s}),
+              std::pair(Outcome::HandedOver, true));
+    // The start that gave up said so; its note must not appear behind its back.
+    EXPECT_EQ(m_actions.calls, QStringList{u"ViewDocument(/home/me/My Notes/a b.pdf)"_s});
 
     running.EndStartup();
     EXPECT_FALSE(running.HoldsLock());
-    m_handlerReturned = false;
-    EXPECT_EQ(StartAnother({QStringLiteral("prog"), QStringLiteral("-NewNote")}, 10s).outcome,
-              Outcome::HandedOver);
+    EXPECT_EQ(StartAnother({u"prog"_s, u"-OpenDocument"_s}), std::pair(Outcome::HandedOver, true));
     EXPECT_EQ(m_actions.calls.size(), 2);
-}
-
-TEST_F(SingleInstanceTest, NoAnswerBeforeTheNavigatorIsPublishedAndNothingRunsLater) {
-    SingleInstance running(kName);
-    ASSERT_EQ(running.Start({QStringLiteral("prog")}), Outcome::Running);
-
-    EXPECT_EQ(StartAnother({QStringLiteral("prog"), QStringLiteral("/NewNote")}, 300ms).outcome,
-              Outcome::NoAnswer);
-    PublishTo(running);
-    EXPECT_EQ(StartAnother({QStringLiteral("prog"), QStringLiteral("/OpenDocument")}, 10s).outcome,
-              Outcome::HandedOver);
-    // The start that gave up said so; its note must not appear behind its back.
-    EXPECT_EQ(m_actions.calls, QStringList{QStringLiteral("OpenDocument")});
-}
-
-TEST_F(SingleInstanceTest, ANavigatorThatWasKilledIsReplaced) {
-    ASSERT_TRUE(MakeDeadLock(LockPath()));
-    ASSERT_TRUE(MakeDeadSocket(SocketPath()));
-
-    SingleInstance next(kName);
-    EXPECT_EQ(next.Start({QStringLiteral("prog")}, 1s), Outcome::Running);
-    EXPECT_TRUE(next.HoldsLock());
-    PublishTo(next);
-    EXPECT_EQ(StartAnother({QStringLiteral("prog"), QStringLiteral("/NewNote")}, 10s).outcome,
-              Outcome::HandedOver);
-}
-
-TEST_F(SingleInstanceTest, AWithdrawnNavigatorMakesLaterStartsWaitUntilItIsGone) {
-    auto running = std::make_unique<SingleInstance>(kName);
-    ASSERT_EQ(running->Start({QStringLiteral("prog")}), Outcome::Running);
-    PublishTo(*running);
-    running->EndStartup();
-
-    running->Withdraw();
-    EXPECT_TRUE(running->HoldsLock());
-    EXPECT_FALSE(QFile::exists(SocketPath()));
-    SingleInstance later(kName);
-    EXPECT_EQ(later.Start({QStringLiteral("prog"), QStringLiteral("/NewNote")}, 200ms),
-              Outcome::NoAnswer);
-
-    running.reset();
-    EXPECT_EQ(later.Start({QStringLiteral("prog"), QStringLiteral("/NewNote")}, 200ms),
-              Outcome::Running);
-    EXPECT_TRUE(m_actions.calls.isEmpty());
 }
 
 TEST_F(SingleInstanceTest, AStartWaitingOnANavigatorThatShutsDownBecomesTheNavigatorAfterIt) {
     auto running = std::make_unique<SingleInstance>(kName);
-    ASSERT_EQ(running->Start({QStringLiteral("prog")}), Outcome::Running);
+    ASSERT_EQ(running->Start({u"prog"_s}), Outcome::Running);
     // Not answering yet, so the later start is still waiting when the shut-down begins.
     running->EndStartup();
-    auto later = InOwnThread([] {
+    auto later = std::async(std::launch::async, [] {
         SingleInstance instance(kName);
-        return instance.Start({QStringLiteral("prog"), QStringLiteral("/NewNote")});
+        return instance.Start({u"prog"_s, u"/NewNote"_s});
     });
     SpinFor(300);
 
+    // Withdrawn, the navigator holds the lock again until it is gone: no second one may start.
     running->Withdraw();
     EXPECT_TRUE(running->HoldsLock());
+    EXPECT_FALSE(QFile::exists(SocketPath()));
     SpinFor(300);
     EXPECT_EQ(later.wait_for(0s), std::future_status::timeout);
 
@@ -166,23 +102,17 @@ TEST_F(SingleInstanceTest, AStartWaitingOnANavigatorThatShutsDownBecomesTheNavig
 
 TEST_F(SingleInstanceTest, ACommandLineThatCannotTravelIsNotHandedOver) {
     SingleInstance running(kName);
-    ASSERT_EQ(running.Start({QStringLiteral("prog")}), Outcome::Running);
+    ASSERT_EQ(running.Start({u"prog"_s}), Outcome::Running);
     PublishTo(running);
 
-    EXPECT_EQ(StartAnother({QStringLiteral("prog"), QStringLiteral("/ViewDocument"),
-                            QStringLiteral("/home/me/\"quoted\".pdf")},
-                           10s)
-                  .outcome,
-              Outcome::NotCarried);
     const QString huge(SharedMemory::kMaximumMessageBytes, u'x');
-    EXPECT_EQ(
-        StartAnother({QStringLiteral("prog"), QStringLiteral("/ViewDocument"), huge}, 10s).outcome,
-        Outcome::NotCarried);
+    for (const QString& file : {u"/home/me/\"quoted\".pdf"_s, huge})
+        EXPECT_EQ(StartAnother({u"prog"_s, u"/ViewDocument"_s, file}).first, Outcome::NotCarried);
     EXPECT_TRUE(m_actions.calls.isEmpty());
 
     // With no navigator running such a command line is simply this start's own.
-    SingleInstance alone(QStringLiteral("AmbrelNavigator-other"));
-    EXPECT_EQ(alone.Start({QStringLiteral("prog"), huge}), Outcome::Running);
+    SingleInstance alone(u"AmbrelNavigator-other"_s);
+    EXPECT_EQ(alone.Start({u"prog"_s, huge}), Outcome::Running);
 }
 
 } // namespace

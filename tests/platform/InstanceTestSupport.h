@@ -1,12 +1,11 @@
 #pragma once
 
-#include <QByteArray>
-#include <QCoreApplication>
 #include <QEventLoop>
 #include <QFile>
 #include <QLocalSocket>
 #include <QSysInfo>
 #include <QTimer>
+#include <QtEndian>
 
 #include <sys/socket.h>
 #include <sys/un.h>
@@ -17,16 +16,14 @@
 
 // A message as a starting navigator sends it: 4-byte big-endian length, then the bytes.
 inline QByteArray Frame(const QByteArray& payload) {
-    const auto size = quint32(payload.size());
-    QByteArray frame;
-    frame.append(char(size >> 24)).append(char(size >> 16)).append(char(size >> 8));
-    frame.append(char(size));
-    return frame + payload;
+    QByteArray length(4, '\0');
+    qToBigEndian(quint32(payload.size()), length.data());
+    return length + payload;
 }
 
-// Runs the event loop until the condition holds; gives up after a generous safety limit so
-// that a fault fails the test instead of hanging it.
-inline bool SpinUntil(const std::function<bool()>& condition) {
+// Runs the event loop until the condition holds or the time is up (the generous default makes
+// a fault fail the test instead of hanging it); answers the condition.
+inline bool SpinUntil(const std::function<bool()>& condition, int milliseconds = 20000) {
     QEventLoop loop;
     QTimer poll;
     QObject::connect(&poll, &QTimer::timeout, &loop, [&] {
@@ -34,7 +31,7 @@ inline bool SpinUntil(const std::function<bool()>& condition) {
             loop.quit();
     });
     poll.start(5);
-    QTimer::singleShot(20000, &loop, &QEventLoop::quit);
+    QTimer::singleShot(milliseconds, &loop, &QEventLoop::quit);
     if (!condition())
         loop.exec();
     return condition();
@@ -42,9 +39,7 @@ inline bool SpinUntil(const std::function<bool()>& condition) {
 
 // Lets the event loop run for a while, for things that must not happen.
 inline void SpinFor(int milliseconds) {
-    QEventLoop loop;
-    QTimer::singleShot(milliseconds, &loop, &QEventLoop::quit);
-    loop.exec();
+    SpinUntil([] { return false; }, milliseconds);
 }
 
 // Sends bytes on a fresh connection from this thread and answers what came back before the

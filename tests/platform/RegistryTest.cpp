@@ -5,48 +5,38 @@
 
 namespace {
 
+using namespace Qt::StringLiterals;
 using Platform::Registry;
 
 class RegistryTest : public AmbrelTest {};
 
-const QString kStartPanelKey =
-    QStringLiteral("SOFTWARE\\Brindle\\Quillmark Ambrel\\Start Panel\\1.0\\Settings\\");
+const QString kKey = u"SOFTWARE\\Brindle\\Quillmark Ambrel\\Start Panel\\1.0\\Settings\\"_s;
+const QString kValue = u"LaunchOnAmbrelStart"_s;
 
 TEST_F(RegistryTest, UserValuesAreWrittenReadAndRemovedUnderTheConfigFolder) {
-    EXPECT_FALSE(
-        Registry::UserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")).isValid());
-    EXPECT_FALSE(Registry::HasUserKey(kStartPanelKey));
-
-    ASSERT_TRUE(Registry::SetUserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart"), 1));
-    EXPECT_EQ(Registry::UserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")).toInt(),
-              1);
-    EXPECT_TRUE(Registry::HasUserKey(kStartPanelKey));
-    // The same key written without its trailing separator or in the other slash form is the
-    // same key.
-    EXPECT_EQ(Registry::UserValue(
-                  QStringLiteral("SOFTWARE/Brindle/Quillmark Ambrel/Start Panel/1.0/Settings"),
-                  QStringLiteral("LaunchOnAmbrelStart"))
-                  .toInt(),
-              1);
-    EXPECT_TRUE(Registry::UserFile().startsWith(ConfigHome() + QStringLiteral("/Brindle/")));
+    EXPECT_FALSE(Registry::UserValue(kKey, kValue).isValid());
+    EXPECT_FALSE(Registry::HasUserKey(kKey));
+    ASSERT_TRUE(Registry::SetUserValue(kKey, kValue, 1));
+    EXPECT_TRUE(Registry::HasUserKey(kKey));
+    // Without the trailing separator or with the other slash it is the same key.
+    EXPECT_EQ(Registry::UserValue(u"SOFTWARE/Brindle/Quillmark Ambrel/Start Panel/1.0/Settings"_s,
+                                  kValue),
+              QVariant(1));
+    EXPECT_TRUE(Registry::UserFile().startsWith(ConfigHome() + u"/Brindle/"_s));
     EXPECT_TRUE(QFile::exists(Registry::UserFile()));
 
-    EXPECT_TRUE(Registry::RemoveUserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")));
-    EXPECT_FALSE(Registry::RemoveUserValue(kStartPanelKey, QStringLiteral("LaunchOnAmbrelStart")));
-    EXPECT_FALSE(Registry::HasUserKey(kStartPanelKey));
+    EXPECT_TRUE(Registry::RemoveUserValue(kKey, kValue));
+    EXPECT_FALSE(Registry::RemoveUserValue(kKey, kValue));
+    EXPECT_FALSE(Registry::HasUserKey(kKey));
 }
 
 TEST_F(RegistryTest, MachineValuesAreReadOnlyFromTheMachineFile) {
-    WriteFile(QStringLiteral("etc/Quillmark Ambrel.ini"),
+    WriteFile(u"etc/Quillmark Ambrel.ini"_s,
               "[Software]\nBrindle\\Quillmark%20Ambrel\\BubbleStartupDelay=5000\n");
-    EXPECT_EQ(Registry::MachineValue(QStringLiteral("Software\\Brindle\\Quillmark Ambrel"),
-                                     QStringLiteral("BubbleStartupDelay"))
-                  .toInt(),
-              5000);
+    const QString key = u"Software\\Brindle\\Quillmark Ambrel"_s;
+    EXPECT_EQ(Registry::MachineValue(key, u"BubbleStartupDelay"_s).toInt(), 5000);
     // A user value of the same name is another scope.
-    EXPECT_FALSE(Registry::UserValue(QStringLiteral("Software\\Brindle\\Quillmark Ambrel"),
-                                     QStringLiteral("BubbleStartupDelay"))
-                     .isValid());
+    EXPECT_FALSE(Registry::UserValue(key, u"BubbleStartupDelay"_s).isValid());
 }
 
 } // namespace

@@ -12,45 +12,42 @@
 
 namespace {
 
+using namespace Qt::StringLiterals;
+
+constexpr QFile::Permissions kPrivate = QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner;
+constexpr QFile::Permissions kOpen =
+    kPrivate | QFile::ReadGroup | QFile::ExeGroup | QFile::ReadOther | QFile::ExeOther; // 0755
+
 // The runtime folder is where the lock and the socket live: only a private folder will do.
+// Failing that, the program makes one of its own in the temporary folder.
 class RuntimeFolderTest : public AmbrelTest {
 protected:
     void SetUp() override {
         AmbrelTest::SetUp();
         m_savedTmp = qgetenv("TMPDIR");
-        ASSERT_TRUE(QDir().mkpath(Temp()));
-        qputenv("TMPDIR", QFile::encodeName(Temp()));
+        ASSERT_TRUE(QDir().mkpath(Home() + u"/tmp"_s));
+        qputenv("TMPDIR", QFile::encodeName(Home() + u"/tmp"_s));
     }
     void TearDown() override {
         qputenv("TMPDIR", m_savedTmp);
         AmbrelTest::TearDown();
     }
-    QString Temp() const { return Home() + QStringLiteral("/tmp"); }
     QString Fallback() const {
-        return Temp() + QStringLiteral("/ambrel-runtime-") + QString::number(::geteuid());
+        return Home() + u"/tmp/ambrel-runtime-"_s + QString::number(::geteuid());
     }
 
-private:
     QByteArray m_savedTmp;
 };
 
-constexpr QFile::Permissions kPrivate = QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner;
-constexpr QFile::Permissions kOthers = QFile::ReadGroup | QFile::WriteGroup | QFile::ExeGroup |
-                                       QFile::ReadOther | QFile::WriteOther | QFile::ExeOther;
-// Mode 0755.
-constexpr QFile::Permissions kOpen =
-    kPrivate | QFile::ReadGroup | QFile::ExeGroup | QFile::ReadOther | QFile::ExeOther;
-
 TEST_F(RuntimeFolderTest, PassesOverALinkedOrOpenFolderForAPrivateOneOfItsOwn) {
-    const QString target = Home() + QStringLiteral("/elsewhere");
+    const QString target = Home() + u"/elsewhere"_s;
     ASSERT_TRUE(QDir().mkpath(target));
     QFile::setPermissions(target, kPrivate);
-    const QString link = Home() + QStringLiteral("/linked-runtime");
-    ASSERT_TRUE(QFile::link(target, link));
-
-    qputenv("XDG_RUNTIME_DIR", QFile::encodeName(link));
+    ASSERT_TRUE(QFile::link(target, Home() + u"/linked-runtime"_s));
+    qputenv("XDG_RUNTIME_DIR", QFile::encodeName(Home() + u"/linked-runtime"_s));
     EXPECT_EQ(Platform::RuntimeFolder(), Fallback());
-    EXPECT_FALSE(QFileInfo(Fallback()).permissions() & kOthers);
+    EXPECT_FALSE(QFileInfo(Fallback()).permissions() & QFile::Permissions(0x0077))
+        << "open to group or others";
 
     QFile::setPermissions(RuntimeHome(), kOpen);
     qputenv("XDG_RUNTIME_DIR", QFile::encodeName(RuntimeHome()));
@@ -64,10 +61,10 @@ TEST_F(RuntimeFolderTest, WithoutAnyPrivateFolderNeitherLockNorSocketIsMade) {
 
     EXPECT_TRUE(Platform::RuntimeFolder().isEmpty());
     StartupMutex mutex;
-    EXPECT_FALSE(mutex.Create(QStringLiteral("AmbrelNavigator-test")));
+    EXPECT_FALSE(mutex.Create(u"AmbrelNavigator-test"_s));
     EXPECT_FALSE(mutex.Wait(std::chrono::milliseconds(0)));
     SharedMemory channel;
-    EXPECT_FALSE(channel.Listen(QStringLiteral("AmbrelNavigator-test")));
+    EXPECT_FALSE(channel.Listen(u"AmbrelNavigator-test"_s));
     EXPECT_TRUE(QDir(RuntimeHome()).isEmpty());
     EXPECT_TRUE(QDir(Fallback()).isEmpty());
 }
