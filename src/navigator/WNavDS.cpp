@@ -13,6 +13,7 @@
 #include "messaging/CNoteToolService.h"
 #include "messaging/CViewerService.h"
 #include "messaging/PropertiesToMap.h"
+#include "navigator/ItemProperties.h"
 #include "settings/NavigatorSettings.h"
 
 #include <utility>
@@ -23,20 +24,7 @@ WNavDS* g_instance = nullptr;
 
 const QString kRoot = QStringLiteral("root");
 
-using PropertiesPtr = ReleasePtr<DataExchange::IProperties>;
-
-PropertiesPtr NewProperties() {
-    return PropertiesPtr(DataExchange::CreateProperties());
-}
-
-// The property's text; null when the set does not hold it.
-QString Property(DataExchange::IProperties* properties, const QString& name) {
-    QString value;
-    UnicodeStringPtr sink(&value);
-    if (properties == nullptr || properties->GetProperty(name, &sink) != S_OK)
-        return {};
-    return value;
-}
+using namespace ItemProperties;
 
 QString Folded(const QString& itemId) {
     return itemId.toCaseFolded();

@@ -12,6 +12,7 @@
 #include "messaging/INoteToolService.h"
 #include "messaging/IViewerService.h"
 #include "messaging/IWindowService.h"
+#include "navigator/ItemProperties.h"
 #include "platform/IMessageBox.h"
 #include "platform/IWaitCursor.h"
 
@@ -22,16 +23,10 @@
 
 namespace {
 
-using PropertiesPtr = ReleasePtr<DataExchange::IProperties>;
+using namespace ItemProperties;
 
 // The bridge asks nothing of the user when it connects, so it needs no owner window.
 constexpr Platform::WindowHandle kNoOwnerWindow = 0;
-
-PropertiesPtr OneProperty(const QString& name, const QString& value) {
-    PropertiesPtr set(DataExchange::CreateProperties());
-    set->SetProperty(name, value);
-    return set;
-}
 
 PropertiesPtr CatalogProperties(const QString& itemId) {
     PropertiesPtr properties(DataExchange::CreateProperties());

@@ -10,6 +10,7 @@
 #include "libs/toolwell/IItemLink.h"
 #include "messaging/INoteToolService.h"
 #include "messaging/IWindowService.h"
+#include "navigator/ItemProperties.h"
 #include "settings/NavigatorSettings.h"
 
 #include <QDir>
@@ -22,23 +23,11 @@
 
 namespace {
 
-using PropertiesPtr = ReleasePtr<DataExchange::IProperties>;
+using namespace ItemProperties;
 
 const QString kRoot = QStringLiteral("root");
 const QString kTrue = QStringLiteral("true");
 const QString kFalse = QStringLiteral("false");
-
-PropertiesPtr NewProperties() {
-    return PropertiesPtr(DataExchange::CreateProperties());
-}
-
-QString Property(DataExchange::IProperties* properties, const QString& name) {
-    QString value;
-    UnicodeStringPtr sink(&value);
-    if (properties == nullptr || properties->GetProperty(name, &sink) != S_OK)
-        return {};
-    return value;
-}
 
 // A file name from the catalog becomes part of a path: only a plain name may.
 bool IsPlainFileName(const QString& name) {
