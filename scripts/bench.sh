@@ -6,10 +6,12 @@ cd "$(dirname "$0")/.."
 
 scripts/setup.sh
 cmake -S . -B build-bench -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DAMBREL_BENCHMARKS=ON >/dev/null
-cmake --build build-bench --parallel "$(nproc)"
+cmake --build build-bench --parallel "$(nproc)" >/dev/null
 
 export QT_QPA_PLATFORM=offscreen
 shopt -s nullglob
 for program in build-bench/bench/bench_*; do
-  [ -x "$program" ] && "$program" "$@"
+  if [ -f "$program" ] && [ -x "$program" ]; then
+    "$program" "$@"
+  fi
 done
