@@ -15,10 +15,6 @@ namespace {
 
 CNoteToolService* g_instance = nullptr;
 
-QString Key(const QString& itemId) {
-    return itemId.toCaseFolded();
-}
-
 constexpr int kDefaultTitleId = 100;
 constexpr qsizetype kMaxStringLength = 1024;
 
@@ -68,7 +64,7 @@ unsigned long CNoteToolService::Release() {
 }
 
 HRESULT CNoteToolService::ClearWindows() {
-    m_openWindows.clear();
+    m_openWindows.Clear();
     return S_OK;
 }
 
@@ -83,29 +79,18 @@ HRESULT CNoteToolService::SetLanguageFolder(const QString& path) {
 }
 
 HRESULT CNoteToolService::ForEachWindow(IWindowCallback* callback) {
-    if (callback == nullptr)
-        return E_INVALIDARG;
-    HRESULT result = S_OK;
-    const QList<Platform::WindowHandle> windows = m_openWindows.values();
-    for (const Platform::WindowHandle window : windows)
-        result = callback->Apply(window, 0);
-    return result;
+    return m_openWindows.ForEach(callback);
 }
 
 HRESULT CNoteToolService::GetWindowCount(int* count) {
     if (count == nullptr)
         return E_INVALIDARG;
-    *count = static_cast<int>(m_openWindows.size());
+    *count = m_openWindows.Count();
     return S_OK;
 }
 
 HRESULT CNoteToolService::FindWindow(const QString& itemId, Platform::WindowHandle* window) {
-    const auto found = m_openWindows.constFind(Key(itemId));
-    if (found == m_openWindows.cend())
-        return S_FALSE;
-    if (window != nullptr)
-        *window = found.value();
-    return S_OK;
+    return m_openWindows.Find(itemId, window);
 }
 
 IWindowService* CNoteToolService::GetWindowService(const QString& itemId) {
@@ -121,15 +106,15 @@ HRESULT CNoteToolService::SetEventTarget(IWindowEventNotification* target) {
 }
 
 HRESULT CNoteToolService::OnNoteWindowOpened(const QString& itemId, Platform::WindowHandle window) {
-    const QString key = Key(itemId);
-    m_openWindows.insert(key, window);
+    const QString key = ItemWindowMap::Key(itemId);
+    m_openWindows.Set(itemId, window);
     if (m_waitingItems.remove(key))
         ActivateNote(itemId);
     return S_OK;
 }
 
 HRESULT CNoteToolService::RemoveWindow(const QString& itemId, int) {
-    m_openWindows.remove(Key(itemId));
+    m_openWindows.Remove(itemId);
     return S_OK;
 }
 
@@ -182,11 +167,11 @@ HRESULT CNoteToolService::UpdateNote(const QString& itemId, DataExchange::IPrope
 }
 
 HRESULT CNoteToolService::ActivateNote(const QString& itemId) {
-    if (m_openWindows.contains(Key(itemId))) {
+    if (m_openWindows.Contains(itemId)) {
         if (IItemWindowHub* hub = GetItemWindowHub())
             hub->ActivateNote(itemId);
     } else {
-        m_waitingItems.insert(Key(itemId));
+        m_waitingItems.insert(ItemWindowMap::Key(itemId));
     }
     return S_OK;
 }

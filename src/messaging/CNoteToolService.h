@@ -1,5 +1,7 @@
 #pragma once
 
+#include "messaging/ItemWindowMap.h"
+
 #include "messaging/INoteToolService.h"
 
 #include <QMap>
@@ -43,7 +45,7 @@ private:
     ~CNoteToolService() override = default;
 
     // Keyed by the case-folded identifier, which makes lookups ignore case.
-    QMap<QString, Platform::WindowHandle> m_openWindows;
+    ItemWindowMap m_openWindows;
     IWindowEventNotification* m_eventTarget = nullptr;
     QSet<QString> m_waitingItems;
     std::atomic<unsigned long> m_references{0};

@@ -11,10 +11,6 @@ namespace {
 
 CViewerService* g_instance = nullptr;
 
-QString Key(const QString& itemId) {
-    return itemId.toCaseFolded();
-}
-
 } // namespace
 
 IViewerService* CViewerService::GetInstance() {
@@ -42,35 +38,23 @@ unsigned long CViewerService::Release() {
 }
 
 HRESULT CViewerService::ClearWindows() {
-    m_openWindows.clear();
+    m_openWindows.Clear();
     return S_OK;
 }
 
 HRESULT CViewerService::ForEachWindow(IWindowCallback* callback) {
-    if (callback == nullptr)
-        return E_INVALIDARG;
-    HRESULT result = S_OK;
-    // A copy: the callback may lead to windows being reported or removed meanwhile.
-    const QList<Platform::WindowHandle> windows = m_openWindows.values();
-    for (const Platform::WindowHandle window : windows)
-        result = callback->Apply(window, 0);
-    return result;
+    return m_openWindows.ForEach(callback);
 }
 
 HRESULT CViewerService::GetWindowCount(int* count) {
     if (count == nullptr)
         return E_INVALIDARG;
-    *count = static_cast<int>(m_openWindows.size());
+    *count = m_openWindows.Count();
     return S_OK;
 }
 
 HRESULT CViewerService::FindWindow(const QString& itemId, Platform::WindowHandle* window) {
-    const auto found = m_openWindows.constFind(Key(itemId));
-    if (found == m_openWindows.cend())
-        return S_FALSE;
-    if (window != nullptr)
-        *window = found.value();
-    return S_OK;
+    return m_openWindows.Find(itemId, window);
 }
 
 HRESULT CViewerService::SetProgramFolder(const QString& path) {
@@ -97,7 +81,7 @@ HRESULT CViewerService::SetEventTarget(IWindowEventNotification* target) {
 
 HRESULT CViewerService::OnDocumentWindowOpened(const QString& itemId,
                                                Platform::WindowHandle window) {
-    const QString key = Key(itemId);
+    const QString key = ItemWindowMap::Key(itemId);
     if (const auto launched = m_launchedDocuments.find(key);
         launched != m_launchedDocuments.end()) {
         // The viewer started for this item shows its first window: hand it the file. Its
@@ -108,23 +92,23 @@ HRESULT CViewerService::OnDocumentWindowOpened(const QString& itemId,
             hub->OpenDocumentInViewer(itemId, path, itemId);
         return S_OK;
     }
-    m_openWindows.insert(key, window);
+    m_openWindows.Set(itemId, window);
     if (m_waitingItems.remove(key))
         ActivateDocument(itemId);
     return S_OK;
 }
 
 HRESULT CViewerService::RemoveWindow(const QString& itemId, int) {
-    m_openWindows.remove(Key(itemId));
+    m_openWindows.Remove(itemId);
     return S_OK;
 }
 
 HRESULT CViewerService::ActivateDocument(const QString& itemId) {
-    if (m_openWindows.contains(Key(itemId))) {
+    if (m_openWindows.Contains(itemId)) {
         if (IItemWindowHub* hub = GetItemWindowHub())
             hub->ActivateDocument(itemId);
     } else {
-        m_waitingItems.insert(Key(itemId));
+        m_waitingItems.insert(ItemWindowMap::Key(itemId));
     }
     return E_FAIL;
 }
@@ -145,7 +129,7 @@ HRESULT CViewerService::OpenDocument(const QString& itemId, const QString& path)
 
     if (m_programFolder.isEmpty())
         return E_FAIL;
-    const QString key = Key(itemId);
+    const QString key = ItemWindowMap::Key(itemId);
     m_launchedDocuments.insert(key, path.isNull() ? QStringLiteral("") : path);
 
     QStringList arguments;

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "messaging/ItemWindowMap.h"
+
 #include "messaging/IViewerService.h"
 
 #include <QMap>
@@ -37,7 +39,7 @@ private:
 
     // Maps and sets are keyed by the case-folded identifier, which makes lookups ignore case.
     QMap<QString, QString> m_launchedDocuments;
-    QMap<QString, Platform::WindowHandle> m_openWindows;
+    ItemWindowMap m_openWindows;
     QSet<QString> m_waitingItems;
     IWindowEventNotification* m_eventTarget = nullptr;
     std::atomic<unsigned long> m_references{0};
