@@ -4,6 +4,10 @@
 // with a dozen properties each, a few linked documents and some deleted items. Written the way
 // the catalog store writes them (UTF-16 with byte-order mark, indented).
 
+#include "catalog/IDataStoreService.h"
+#include "common/ReleasePtr.h"
+#include "libs/toolwell/CDataStoreHost.h"
+
 #include <QDir>
 #include <QString>
 #include <QTemporaryDir>
@@ -11,6 +15,7 @@
 #include <pugixml.hpp>
 
 #include <cstdio>
+#include <functional>
 #include <map>
 #include <memory>
 #include <random>
@@ -158,6 +163,25 @@ inline const GeneratedCatalog& PrepareCatalog(int itemCount) {
         WriteCatalog(appData + QStringLiteral("/Catalog/catalog.xml"), itemCount, 20240611u);
     catalog.appDataFolder = appData;
     return made.emplace(itemCount, std::move(catalog)).first->second;
+}
+
+// The data store service over the catalog, loaded once and kept while the benchmarks of that
+// size run. onNewCatalog gets the host whenever another catalog had to be opened.
+inline IDataStoreService*
+ServiceFor(const GeneratedCatalog& catalog,
+           const std::function<void(IDataStoreHost*)>& onNewCatalog = {}) {
+    static QString loaded;
+    IDataStoreService* service = GetDataStoreService();
+    if (service != nullptr && loaded == catalog.appDataFolder)
+        return service;
+    if (service != nullptr)
+        service->Shutdown(0);
+    ReleasePtr<IDataStoreHost> host(new CDataStoreHost(catalog.appDataFolder));
+    loaded = catalog.appDataFolder;
+    IDataStoreService* created = CreateDataStoreService(host.get());
+    if (onNewCatalog)
+        onNewCatalog(host.get());
+    return created;
 }
 
 } // namespace Bench

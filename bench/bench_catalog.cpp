@@ -6,7 +6,6 @@
 #include "common/ReleasePtr.h"
 #include "dataexchange/CRecursiveChildrenReporter.h"
 #include "dataexchange/WProperties.h"
-#include "libs/toolwell/CDataStoreHost.h"
 
 #include <benchmark/benchmark.h>
 
@@ -14,19 +13,7 @@
 
 namespace {
 
-// The service over the catalog of the given size, loaded once and kept while the benchmarks
-// of that size run.
-IDataStoreService* ServiceFor(const Bench::GeneratedCatalog& catalog) {
-    static QString loaded;
-    IDataStoreService* service = GetDataStoreService();
-    if (service != nullptr && loaded == catalog.appDataFolder)
-        return service;
-    if (service != nullptr)
-        service->Shutdown(0);
-    ReleasePtr<IDataStoreHost> host(new CDataStoreHost(catalog.appDataFolder));
-    loaded = catalog.appDataFolder;
-    return CreateDataStoreService(host.get());
-}
+using Bench::ServiceFor;
 
 ReleasePtr<DataExchange::IProperties> NoteProperties(const QString& title) {
     ReleasePtr<DataExchange::IProperties> properties(DataExchange::CreateProperties());

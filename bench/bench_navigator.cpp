@@ -5,7 +5,6 @@
 
 #include "catalog/IDataStoreService.h"
 #include "common/ReleasePtr.h"
-#include "libs/toolwell/CDataStoreHost.h"
 #include "navigator/WNavDS.h"
 #include "platform/IProcessLauncher.h"
 
@@ -16,24 +15,18 @@
 
 namespace {
 
-IDataStoreService* ServiceFor(const Bench::GeneratedCatalog& catalog) {
-    static QString loaded;
-    IDataStoreService* service = GetDataStoreService();
-    if (service != nullptr && loaded == catalog.appDataFolder)
-        return service;
-    if (service != nullptr)
-        service->Shutdown(0);
-    ReleasePtr<IDataStoreHost> host(new CDataStoreHost(catalog.appDataFolder));
-    loaded = catalog.appDataFolder;
-    IDataStoreService* created = CreateDataStoreService(host.get());
-    WNavDS::DestroyInstance();
-    WNavDS::Instance()->SetDataStoreHost(host.get());
-    return created;
+// The service over the catalog, with a fresh model over the same host whenever the catalog
+// changes.
+IDataStoreService* ModelServiceFor(const Bench::GeneratedCatalog& catalog) {
+    return Bench::ServiceFor(catalog, [](IDataStoreHost* host) {
+        WNavDS::DestroyInstance();
+        WNavDS::Instance()->SetDataStoreHost(host);
+    });
 }
 
 void BM_CatalogOpen(benchmark::State& state) {
     IDataStoreService* service =
-        ServiceFor(Bench::PrepareCatalog(static_cast<int>(state.range(0))));
+        ModelServiceFor(Bench::PrepareCatalog(static_cast<int>(state.range(0))));
     for (auto _ : state) {
         if (service->Open() != S_OK)
             state.SkipWithError("catalog did not load");
@@ -42,7 +35,7 @@ void BM_CatalogOpen(benchmark::State& state) {
 
 void BM_WNavDSLoad(benchmark::State& state) {
     const int itemCount = static_cast<int>(state.range(0));
-    ServiceFor(Bench::PrepareCatalog(itemCount));
+    ModelServiceFor(Bench::PrepareCatalog(itemCount));
     WNavDS* model = WNavDS::Instance();
     for (auto _ : state)
         model->Load();
@@ -59,7 +52,7 @@ public:
 
 // The model over the catalog, loaded with its services as at start-up.
 WNavDS* ModelFor(const Bench::GeneratedCatalog& catalog) {
-    ServiceFor(catalog);
+    ModelServiceFor(catalog);
     WNavDS* model = WNavDS::Instance();
     if (model->GetNoteToolService() == nullptr)
         model->Initialize();

@@ -350,20 +350,15 @@ void WNavDS::CloseAllWindowsAndWait(std::chrono::milliseconds wait) {
     INoteToolService* noteTool = m_noteToolService;
     IViewerService* viewer = m_viewerService;
     const std::function<void()> idlePass = m_idlePassHook;
-    WaitForWindows(
-        [noteTool] {
+    const auto windowCount = [](auto* service) {
+        return [service] {
             int count = 0;
-            noteTool->GetWindowCount(&count);
+            service->GetWindowCount(&count);
             return count;
-        },
-        wait, idlePass);
-    WaitForWindows(
-        [viewer] {
-            int count = 0;
-            viewer->GetWindowCount(&count);
-            return count;
-        },
-        wait, idlePass);
+        };
+    };
+    WaitForWindows(windowCount(noteTool), wait, idlePass);
+    WaitForWindows(windowCount(viewer), wait, idlePass);
 }
 
 void WNavDS::OpenNewDocumentInViewer() {

@@ -5,6 +5,7 @@
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 #include "support/AmbrelTest.h"
+#include "support/FakeHarborUtils.h"
 #include "support/RecordingProcessLauncher.h"
 
 #include <QApplication>
@@ -15,28 +16,6 @@
 namespace {
 
 using namespace Qt::StringLiterals;
-
-// A utility engine whose readiness the test chooses.
-class FakeHarborUtils final : public IHarborUtils {
-public:
-    bool IsReady() override { return ready; }
-    bool IsEnabled() override { return enabled; }
-    void* GetMessageCenter() override { return nullptr; }
-    int IsFeatureAvailable(int) override { return 0; }
-    void ShowMessageArchive() override {}
-    void CheckForUpdates() override {}
-    void SetStartupBubbleEnabled(bool) override {}
-    int IsStartupBubbleEnabled() override { return 0; }
-    void SetNavigatorRect(const QRect&) override {}
-    void OnNavigatorClosing() override {}
-    void GetMessageCenterSize(int*, int*) override {}
-    void SetShuttingDown(bool flag) override { shuttingDownCalls.append(flag); }
-    void RunQmoStartAction() override {}
-
-    bool ready = true;
-    bool enabled = true;
-    QList<bool> shuttingDownCalls;
-};
 
 class NavigatorAppTest : public AmbrelTest {
 protected:

@@ -3,6 +3,7 @@
 #include "libs/toolwell/CHarborUtils.h"
 #include "settings/ISettingsWindow.h"
 #include "support/AmbrelTest.h"
+#include "support/FakeHarborUtils.h"
 
 #include <QStringList>
 
@@ -30,24 +31,6 @@ public:
         return QString::fromUtf16(what) + (value ? u'+' : u'-');
     }
     QStringList calls;
-};
-
-// A utility engine that offers the message centre.
-class MessageCentreUtils final : public IHarborUtils {
-public:
-    bool IsReady() override { return true; }
-    bool IsEnabled() override { return true; }
-    void* GetMessageCenter() override { return nullptr; }
-    int IsFeatureAvailable(int featureId) override { return featureId == 6 ? 1 : 0; }
-    void ShowMessageArchive() override {}
-    void CheckForUpdates() override {}
-    void SetStartupBubbleEnabled(bool) override {}
-    int IsStartupBubbleEnabled() override { return 0; }
-    void SetNavigatorRect(const QRect&) override {}
-    void OnNavigatorClosing() override {}
-    void GetMessageCenterSize(int*, int*) override {}
-    void SetShuttingDown(bool) override {}
-    void RunQmoStartAction() override {}
 };
 
 } // namespace
@@ -84,7 +67,8 @@ TEST_F(NavigatorSettingsTest, WindowOptionsReachTheWindowAtOnce) {
     Settings()->SetShowMessageCentre(true); // no message centre on this engine: hidden
     EXPECT_FALSE(Settings()->GetShowMessageCentre());
 
-    MessageCentreUtils utils;
+    FakeHarborUtils utils;
+    utils.messageCentre = true;
     SetHarborUtilsForTesting(&utils);
     EXPECT_FALSE(Settings()->GetShowMessageCentre()) << "choosing it without one stored false";
     Settings()->SetShowMessageCentre(true);
