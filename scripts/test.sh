@@ -1,12 +1,38 @@
 #!/usr/bin/env bash
-# Sets up, builds everything (Debug, warnings as errors, in build-test/) and runs every test
-# offscreen inside a private session bus. Extra arguments go to ctest (for example -R Name).
+# Sets up, builds and runs every test twice: a Debug build in build-test/ and a build with
+# AddressSanitizer and UndefinedBehaviorSanitizer in build-asan/, both with warnings as errors,
+# offscreen inside a private session bus. AMBREL_TEST_BUILD=debug or =asan runs one of them.
+# Extra arguments go to ctest (for example -R Name).
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
 scripts/setup.sh
-cmake -S . -B build-test -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DAMBREL_WERROR=ON >/dev/null
-cmake --build build-test --parallel "$(nproc)"
+
+builds=(debug asan)
+if [ -n "${AMBREL_TEST_BUILD:-}" ]; then
+  case "$AMBREL_TEST_BUILD" in
+    debug | asan) builds=("$AMBREL_TEST_BUILD") ;;
+    *) echo "AMBREL_TEST_BUILD is debug or asan, not '$AMBREL_TEST_BUILD'." >&2; exit 2 ;;
+  esac
+fi
 
 export QT_QPA_PLATFORM=offscreen
-exec dbus-run-session -- ctest --test-dir build-test --output-on-failure --parallel "$(nproc)" "$@"
+# Leaks that belong to the libraries below the program are listed, each with its reason, in
+# the suppression file; everything else fails the test that leaked.
+export ASAN_OPTIONS=detect_leaks=1:abort_on_error=0:strict_string_checks=1:detect_stack_use_after_return=1
+export LSAN_OPTIONS="suppressions=$PWD/tests/sanitizer/lsan.supp:print_suppressions=0"
+export UBSAN_OPTIONS=print_stacktrace=1:halt_on_error=1
+
+for build in "${builds[@]}"; do
+  directory=build-test
+  options=()
+  if [ "$build" = asan ]; then
+    directory=build-asan
+    options=(-DAMBREL_SANITIZE=ON)
+  fi
+  echo "== $build build, in $directory/"
+  cmake -S . -B "$directory" -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DAMBREL_WERROR=ON \
+    "${options[@]}" >/dev/null
+  cmake --build "$directory" --parallel "$(nproc)"
+  dbus-run-session -- ctest --test-dir "$directory" --output-on-failure --parallel "$(nproc)" "$@"
+done
