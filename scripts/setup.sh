@@ -8,7 +8,7 @@ packages=(
   qt6-base-dev qt6-base-dev-tools libqt6dbus6 libqt6network6 qt6-qpa-plugins
   libpugixml-dev
   googletest libgtest-dev libgmock-dev libbenchmark-dev
-  dbus-daemon dbus-bin
+  dbus-daemon dbus-bin xdg-utils
   fonts-dejavu-core
 )
 
