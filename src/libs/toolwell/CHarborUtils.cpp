@@ -1,5 +1,7 @@
 #include "libs/toolwell/CHarborUtils.h"
 
+#include "libs/toolwell/StartupBubble.h"
+
 #include <memory>
 
 namespace {
@@ -11,6 +13,20 @@ IHarborUtils* g_testInstance = nullptr;
 
 int CHarborUtils::IsFeatureAvailable(int) {
     return 0;
+}
+
+void CHarborUtils::SetStartupBubbleEnabled(bool enabled) {
+    StartupBubble::SetEnabled(enabled);
+}
+
+int CHarborUtils::IsStartupBubbleEnabled() {
+    return StartupBubble::IsEnabled() ? 1 : 0;
+}
+
+void CHarborUtils::SetNavigatorRect(const QRect& rect) {
+    m_navigatorRect = rect;
+    if (StartupBubble::IsEnabled() && StartupBubble::Show(rect))
+        StartupBubble::SetEnabled(false);
 }
 
 void CHarborUtils::GetMessageCenterSize(int* width, int* height) {

@@ -4,6 +4,7 @@
 
 // The utility engine as far as the navigator needs it on Linux. There is no message centre
 // and no update service here, so the features that depend on them answer "not available".
+// The start-up bubble is a desktop notification shown once per user (see StartupBubble).
 class CHarborUtils final : public IHarborUtils {
 public:
     bool IsReady() override { return true; }
@@ -12,9 +13,10 @@ public:
     int IsFeatureAvailable(int featureId) override;
     void ShowMessageArchive() override {}
     void CheckForUpdates() override {}
-    void SetStartupBubbleEnabled(bool enabled) override { m_bubbleEnabled = enabled; }
-    int IsStartupBubbleEnabled() override { return m_bubbleEnabled ? 1 : 0; }
-    void SetNavigatorRect(const QRect& rect) override { m_navigatorRect = rect; }
+    void SetStartupBubbleEnabled(bool enabled) override;
+    int IsStartupBubbleEnabled() override;
+    // Keeps the window's place and, while the bubble is enabled, shows it.
+    void SetNavigatorRect(const QRect& rect) override;
     void OnNavigatorClosing() override { m_navigatorClosing = true; }
     void GetMessageCenterSize(int* width, int* height) override;
     void SetShuttingDown(bool shuttingDown) override { m_shuttingDown = shuttingDown; }
@@ -24,7 +26,6 @@ public:
     QRect NavigatorRect() const { return m_navigatorRect; }
 
 private:
-    bool m_bubbleEnabled = false;
     bool m_shuttingDown = false;
     bool m_navigatorClosing = false;
     QRect m_navigatorRect;
