@@ -133,10 +133,15 @@ void BM_DeleteFolder(benchmark::State& state) {
     }
 }
 
+// Writing a catalog with one changed item (an unchanged catalog is not written at all).
 void BM_Save(benchmark::State& state) {
-    IDataStoreService* service =
-        ServiceFor(Bench::PrepareCatalog(static_cast<int>(state.range(0))));
+    const auto& catalog = Bench::PrepareCatalog(static_cast<int>(state.range(0)));
+    IDataStoreService* service = ServiceFor(catalog);
+    const auto renamed = NoteProperties(QStringLiteral("Renamed"));
     for (auto _ : state) {
+        state.PauseTiming();
+        service->UpdateProperties(catalog.notes.front(), renamed.get());
+        state.ResumeTiming();
         if (service->Save() != S_OK)
             state.SkipWithError("catalog was not written");
     }

@@ -154,7 +154,7 @@ HRESULT DataStoreAdapter::Close() {
 HRESULT DataStoreAdapter::Save() {
     if (!IsServiceOpen())
         return E_FAIL;
-    return m_store.Save() ? S_OK : E_FAIL;
+    return m_store.SaveIfModified() ? S_OK : E_FAIL;
 }
 
 HRESULT DataStoreAdapter::Suspend() {

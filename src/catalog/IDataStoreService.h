@@ -60,7 +60,8 @@ public:
     // Makes the catalog file when there is none and loads it.
     virtual HRESULT Open() = 0;
     virtual HRESULT Close() = 0;
-    // Writes the catalog; a catalog that failed to load is never written over.
+    // Writes the catalog when it changed since it was loaded or last written, and answers S_OK
+    // without writing otherwise; a catalog that failed to load is never written over.
     virtual HRESULT Save() = 0;
     // While suspended every catalog operation, Save included, answers E_FAIL.
     virtual HRESULT Suspend() = 0;

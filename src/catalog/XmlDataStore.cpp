@@ -271,6 +271,7 @@ bool XmlDataStore::RemoveNode(pugi::xml_node node) {
     if (!node || IsProtected(node))
         return false;
     UnindexSubtree(node);
+    MarkModified();
     return node.parent().remove_child(node);
 }
 
@@ -293,6 +294,7 @@ QString XmlDataStore::CreateItem(const QString& kind) {
         return {};
     }
     child.append_attribute("uuidref") = idText.constData();
+    MarkModified();
     IndexSubtree(item);
     IndexSubtree(child);
     return id;
@@ -345,11 +347,29 @@ bool XmlDataStore::AddProperty(const QString& id, const QString& name, const QSt
     pugi::xml_node property = properties.append_child(name.toUtf8().constData());
     if (!property)
         return false;
+    MarkModified();
     if (value.isEmpty())
         return true;
     // Text of blanks only would be dropped when the file is read back; a CDATA section keeps it.
     const pugi::xml_node_type type = IsWhitespaceOnly(value) ? pugi::node_cdata : pugi::node_pcdata;
     return property.append_child(type).set_value(value.toUtf8().constData());
+}
+
+bool XmlDataStore::IsLastProperty(const QString& id, const QString& name,
+                                  const QString& value) const {
+    const pugi::xml_node item = FindItem(id);
+    const pugi::xml_node properties = FirstChildElement(item, "properties");
+    const pugi::xml_node property = properties.last_child();
+    if (!properties || !property || property.first_attribute() ||
+        FirstChildElement(properties, name.toUtf8().constData()) != property)
+        return false;
+    // Exactly what AddProperty makes of the value.
+    const pugi::xml_node text = property.first_child();
+    if (value.isEmpty())
+        return !text;
+    const pugi::xml_node_type type = IsWhitespaceOnly(value) ? pugi::node_cdata : pugi::node_pcdata;
+    return text && !text.next_sibling() && text.type() == type &&
+           QString::fromUtf8(text.value()) == value;
 }
 
 bool XmlDataStore::ReadProperty(const QString& id, const QString& name, QString* value) {
@@ -458,9 +478,12 @@ bool XmlDataStore::MoveNode(pugi::xml_node source, pugi::xml_node newParent,
     }
     // The node itself moves, so the indexes stay valid; the order of any duplicates is
     // worked out at lookup.
-    if (before && before.parent() == newParent)
-        return static_cast<bool>(newParent.insert_move_before(source, before));
-    return static_cast<bool>(newParent.append_move(source));
+    const bool moved = before && before.parent() == newParent
+                           ? static_cast<bool>(newParent.insert_move_before(source, before))
+                           : static_cast<bool>(newParent.append_move(source));
+    if (moved)
+        MarkModified();
+    return moved;
 }
 
 QString XmlDataStore::FindDocumentByPath(const QString& path) {

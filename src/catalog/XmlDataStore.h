@@ -49,6 +49,9 @@ public:
     // Appends without looking at an existing property of that name. Names that are not XML
     // element names are refused: written out, they would make the catalog unreadable.
     bool AddProperty(const QString& id, const QString& name, const QString& value);
+    // Whether the item's last property is the only one of that name and holds exactly what
+    // AddProperty would make of value: replacing it would rebuild the same document.
+    bool IsLastProperty(const QString& id, const QString& name, const QString& value) const;
     bool ReadProperty(const QString& id, const QString& name, QString* value);
     int CopyPropertiesTo(const QString& id, DataExchange::IProperties* target);
     int GetChildren(const QString& id, QStringList* children) const;

@@ -1,6 +1,7 @@
 #include "catalog/XmlDataStoreBase.h"
 
 #include <QFile>
+#include <QFileInfo>
 #include <QSaveFile>
 
 namespace Brindle::Data::XmlAccess {
@@ -69,6 +70,7 @@ XmlDataStoreBase::~XmlDataStoreBase() = default;
 bool XmlDataStoreBase::Initialize() {
     m_document = std::make_unique<pugi::xml_document>();
     m_loadFailed = false;
+    m_modified = false;
     m_open = 1;
     return m_open == 1;
 }
@@ -76,6 +78,7 @@ bool XmlDataStoreBase::Initialize() {
 bool XmlDataStoreBase::Close() {
     m_document.reset();
     m_loadFailed = false;
+    m_modified = false;
     m_open = 0;
     return true;
 }
@@ -90,11 +93,12 @@ bool XmlDataStoreBase::LoadFrom(const QString& path) {
     if (!loaded)
         m_document->reset(); // a failed parse leaves a partial tree behind
     m_loadFailed = !loaded;
+    m_modified = false;
     return loaded;
 }
 
 bool XmlDataStoreBase::SaveTo(const QString& path) {
-    if (path.isEmpty() || !IsOpen() || m_loadFailed || !m_document->document_element())
+    if (path.isEmpty() || !IsSavable())
         return false;
     DeclareUtf16(m_document.get());
     QSaveFile file(path);
@@ -103,7 +107,24 @@ bool XmlDataStoreBase::SaveTo(const QString& path) {
     SaveFileWriter writer(&file);
     m_document->save(writer, "\t", pugi::format_default | pugi::format_write_bom,
                      pugi::encoding_utf16_le);
-    return file.commit();
+    // The buffered tail is written by the flush; commit would not see that write fail.
+    if (!file.flush())
+        file.cancelWriting();
+    if (!file.commit())
+        return false;
+    if (path == m_path)
+        m_modified = false;
+    return true;
+}
+
+bool XmlDataStoreBase::SaveIfModified() {
+    if (!m_modified && IsSavable() && QFileInfo::exists(m_path))
+        return true;
+    return Save();
+}
+
+bool XmlDataStoreBase::IsSavable() const {
+    return IsOpen() && !m_loadFailed && m_document->document_element();
 }
 
 bool XmlDataStoreBase::AcceptDocument(const pugi::xml_document& document) {

@@ -33,6 +33,9 @@ public:
     // so a failed write leaves the previous file whole.
     virtual bool SaveTo(const QString& path);
     bool Save() { return SaveTo(m_path); }
+    // Save, but only when the document changed since it was loaded or last written to its own
+    // file (or that file has gone); an unchanged document answers as saved.
+    bool SaveIfModified();
     virtual bool IsOpen() const;
 
     const QString& Path() const { return m_path; }
@@ -41,15 +44,20 @@ public:
 
 protected:
     pugi::xml_document* MutableDocument() { return m_document.get(); }
+    // Every change to the document calls this, so that it reaches the file at the next save.
+    void MarkModified() { m_modified = true; }
     // Called once on every freshly parsed document; false refuses it like a malformed file.
     // The default refuses documents nested deeper than kMaxDepth.
     virtual bool AcceptDocument(const pugi::xml_document& document);
 
 private:
+    bool IsSavable() const;
+
     int m_open = 0;
     std::unique_ptr<pugi::xml_document> m_document;
     QString m_path;
     bool m_loadFailed = false;
+    bool m_modified = false;
 };
 
 } // namespace Brindle::Data::XmlAccess

@@ -151,8 +151,9 @@ bool NavigatorSettings::Load() {
     const qint64 length = file.size();
     const QByteArray bytes = file.readAll();
     file.close();
-    // A short read or half a code unit at the end: the file is not whole, keep what we have.
-    if (bytes.size() < length || bytes.size() % 2 != 0)
+    // A short read: the file is not whole, keep what we have. A lone last byte is only half a
+    // code unit and is dropped; every complete pair before it still counts.
+    if (bytes.size() < length)
         return false;
 
     // Text after an embedded zero unit is ignored; a byte-order mark is not skipped, it
@@ -211,7 +212,8 @@ bool NavigatorSettings::Save() {
     QSaveFile file(folder + QStringLiteral("/NavSettings.dat"));
     if (!file.open(QIODevice::WriteOnly))
         return false;
-    if (file.write(bytes) != bytes.size()) {
+    // The buffered tail is written by the flush; commit would not see that write fail.
+    if (file.write(bytes) != bytes.size() || !file.flush()) {
         file.cancelWriting();
         return false;
     }

@@ -6,6 +6,7 @@
 #include "settings/NavigatorSettings.h"
 #include "support/AmbrelTest.h"
 #include "support/FakeHarborUtils.h"
+#include "support/FileWatch.h"
 #include "support/RecordingProcessLauncher.h"
 
 #include <QApplication>
@@ -110,6 +111,49 @@ TEST_F(NavigatorAppTest, AFreshStartMakesTheCatalogAndABrokenOneIsLeftAlone) {
     WriteFile(u"data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"_s, broken);
     StartAndEnd();
     EXPECT_EQ(Read(u"Catalog/catalog.xml"_s), broken);
+}
+
+TEST_F(NavigatorAppTest, TheIdlePassWritesTheCatalogOnlyAfterItChanged) {
+    const QString folder = u"0F8FAD5B-D9CB-469F-A165-70867728950E"_s;
+    const QString note = u"7C9E6679-7425-40DE-944B-E07FC1F90AE7"_s;
+    for (const char* open : {"false", "true"}) {
+        SCOPED_TRACE(open);
+        const QString catalog =
+            WriteFile(u"data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"_s,
+                      QStringLiteral(
+                          "<?xml version=\"1.0\" encoding=\"UTF-8\"?><archive><organization>"
+                          "<root><child uuidref=\"%1\"><child uuidref=\"%2\"/></child></root>"
+                          "</organization><items><folder uuid=\"%1\"><properties><type>folder"
+                          "</type><expanded>true</expanded></properties></folder><note uuid=\"%2\">"
+                          "<properties><type>note</type><open>%3</open><title>Old</title>"
+                          "</properties></note></items></archive>")
+                          .arg(folder, note, QString::fromLatin1(open))
+                          .toUtf8());
+        const FileWatch start(catalog);
+        CNavigatorApp app({u"ambrel-navigator"_s});
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        EXPECT_EQ(start.Untouched(), QByteArray(open) == "false")
+            << "closing an item recorded open is the only change a start makes";
+
+        const FileWatch select(catalog);
+        WNavDS::Instance()->SelectById(note);
+        app.OnIdle(0);
+        EXPECT_TRUE(select.Untouched()) << "a selection is not a change";
+
+        ReleasePtr<DataExchange::IProperties> title(DataExchange::CreateProperties());
+        title->SetProperty(u"title"_s, u"Renamed"_s);
+        WNavDS::Instance()->UpdateItem(note, title.get(), false);
+        app.OnIdle(0);
+        EXPECT_TRUE(
+            QString(
+                QStringDecoder(QStringConverter::Utf16LE).decode(Read(u"Catalog/catalog.xml"_s)))
+                .contains(u"<title>Renamed</title>"_s))
+            << "the idle pass did not write the catalog";
+        delete app.MainWindow();
+        app.ExitInstance();
+        ResetSingletons();
+    }
 }
 
 TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {

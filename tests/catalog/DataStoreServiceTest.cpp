@@ -6,11 +6,14 @@
 #include "dataexchange/CRecursiveChildrenReporter.h"
 #include "dataexchange/WProperties.h"
 #include "libs/toolwell/IDataStoreHost.h"
+#include "support/FileSizeLimit.h"
+#include "support/FileWatch.h"
 
 #include <QDir>
 #include <QFileInfo>
 #include <QRegularExpression>
 
+#include <functional>
 #include <initializer_list>
 #include <utility>
 
@@ -194,6 +197,79 @@ TEST_F(DataStoreServiceTest, CatalogThatFailedToLoadSurvivesShutdownUntouched) {
     EXPECT_EQ(service->Save(), E_FAIL);
     service->Shutdown(1);
     EXPECT_EQ(ReadBytes(m_catalog), broken);
+    EXPECT_EQ(QDir(QFileInfo(m_catalog).path()).entryList(QDir::Files),
+              QStringList{QStringLiteral("catalog.xml")});
+}
+
+TEST_F(DataStoreServiceTest, SaveWritesTheFileOnlyAfterTheCatalogChanged) {
+    const QString note = Note("n");
+    const QString folder = Create(&IDataStoreService::CreateFolder,
+                                  Properties({{"title", "f"}, {"type", "folder"}}).get());
+    const QString bare = Folder();
+    ASSERT_EQ(Service()->Save(), S_OK);
+
+    const auto expectUntouched = [&](const char* what, const std::function<void()>& act) {
+        const FileWatch watch(m_catalog);
+        act();
+        EXPECT_EQ(Service()->Save(), S_OK) << what;
+        EXPECT_TRUE(watch.Untouched()) << what;
+    };
+    expectUntouched("reading", [&] {
+        ReleasePtr<IProperties> read(DataExchange::CreateProperties());
+        Service()->GetProperties(note, read.get());
+        Service()->GetProperties(bare, read.get()); // makes its empty "properties" element
+        CRecursiveChildrenReporter descendants;
+        Service()->ReportDescendants(kRoot, &descendants);
+    });
+    // Replacing the last property by its own value would rebuild the same document.
+    expectUntouched("same last value", [&] {
+        Service()->UpdateProperties(note, Properties({{"title", "n"}}).get());
+    });
+    expectUntouched("reloading", [&] {
+        Service()->Shutdown(1);
+        Service();
+    });
+
+    const std::pair<const char*, std::function<void()>> changes[] = {
+        {"note", [&] { Note("x"); }},
+        {"folder", [&] { Folder(); }},
+        {"document", [&] { Create(&IDataStoreService::CreateDocument); }},
+        {"set",
+         [&] {
+             Service()->SetProperties(bare, Properties({{"title", "b"}}).get());
+         }},
+        {"rename",
+         [&] {
+             Service()->UpdateProperties(note, Properties({{"title", "m"}}).get());
+         }},
+        {"same value, moved last",
+         [&] {
+             Service()->UpdateProperties(folder, Properties({{"title", "f"}}).get());
+         }},
+        {"move", [&] { Service()->MoveItem(note, folder); }},
+        {"move before", [&] { Service()->MoveItemBefore(bare, folder, note); }},
+        {"delete", [&] { Service()->DeleteItem(bare); }},
+    };
+    for (const auto& [what, change] : changes) {
+        const FileWatch watch(m_catalog);
+        change();
+        EXPECT_EQ(Service()->Save(), S_OK) << what;
+        EXPECT_FALSE(watch.Untouched()) << what;
+    }
+}
+
+TEST_F(DataStoreServiceTest, AFailedSaveLeavesTheOldCatalogWhole) {
+    Note("n");
+    ASSERT_EQ(Service()->Save(), S_OK);
+    const QByteArray old = ReadBytes(m_catalog);
+    Create(
+        &IDataStoreService::CreateFolder,
+        Properties({{"title", "A title far too long to fit in what is left of the disk"}}).get());
+    {
+        const FileSizeLimit full(old.size() + 8);
+        EXPECT_EQ(Service()->Save(), E_FAIL);
+    }
+    EXPECT_EQ(ReadBytes(m_catalog), old);
     EXPECT_EQ(QDir(QFileInfo(m_catalog).path()).entryList(QDir::Files),
               QStringList{QStringLiteral("catalog.xml")});
 }

@@ -1,5 +1,6 @@
 #include "settings/NavigatorSettings.h"
 #include "support/AmbrelTest.h"
+#include "support/FileSizeLimit.h"
 
 #include <QDir>
 #include <QFile>
@@ -137,10 +138,12 @@ TEST_F(SettingsFileTest, DamagedContentAndUnknownKeys) {
                       u"showopeneditemsonly|false|showpdf|false|showqmd|false|"));
 }
 
-TEST_F(SettingsFileTest, TruncatedOrUnreadableFileKeepsTheDefaults) {
+TEST_F(SettingsFileTest, AStrayLastByteIsDroppedAndAnUnreadableFileKeepsTheDefaults) {
     WriteSettings(Utf16Le(u"keepontop|true|maxlinkeddocuments|5|") + QByteArray("x"));
-    EXPECT_FALSE(Settings()->Load()) << "half a code unit at the end";
-    ExpectDefaults();
+    ASSERT_TRUE(Settings()->Load()) << "half a code unit at the end";
+    EXPECT_TRUE(Settings()->GetKeepOnTop());
+    EXPECT_EQ(Settings()->GetMaxLinkedDocuments(), 5);
+    ResetSingletons();
 
     QFile::remove(FilePath());
     ASSERT_TRUE(QDir().mkpath(FilePath()));
@@ -166,4 +169,17 @@ TEST_F(SettingsFileTest, SaveIfDirtyWritesOnceAndClearsTheFlagEvenOnFailure) {
     Settings()->SetShowFrame(false);
     Settings()->SaveIfDirty();
     EXPECT_FALSE(Settings()->IsDirty());
+}
+
+TEST_F(SettingsFileTest, AFailedSaveLeavesTheOldFileWhole) {
+    ASSERT_TRUE(Settings()->Save());
+    const QByteArray old = FileBytes();
+    Settings()->SetDefaultFont(QStringLiteral("A font name far too long to fit in the file"));
+    {
+        const FileSizeLimit full(old.size() + 8);
+        EXPECT_FALSE(Settings()->Save());
+    }
+    EXPECT_EQ(FileBytes(), old);
+    EXPECT_EQ(QDir(AppDataFolder()).entryList(QDir::Files),
+              QStringList{QStringLiteral("NavSettings.dat")});
 }
