@@ -1,6 +1,8 @@
 #include "support/AmbrelTest.h"
 
 #include "catalog/IDataStoreService.h"
+#include "libs/lustre/CVisualStyleManager.h"
+#include "libs/sheen/ThemeUtilities.h"
 #include "libs/toolwell/CHarborUtils.h"
 #include "libs/toolwell/IItemWindowHub.h"
 #include "libs/toolwell/ISnapshotService.h"
@@ -34,6 +36,8 @@ void ResetSingletons() {
     CViewerService::ResetInstance();
     SetItemWindowHub(nullptr);
     Platform::SetForeignWindows(nullptr);
+    ShutdownThemeUtilities();
+    DeleteVisualStyleManager();
 }
 
 void AmbrelTest::SetUp() {
