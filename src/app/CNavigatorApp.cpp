@@ -6,6 +6,7 @@
 #include "libs/toolwell/ISnapshotService.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
+#include "ui/ModalDialog.h"
 #include "ui/QtMessageBox.h"
 #include "ui/QtWaitCursor.h"
 #include "ui/TerminationSignals.h"
@@ -164,6 +165,8 @@ bool CNavigatorApp::OnIdle(int count) {
 }
 
 int CNavigatorApp::ExitInstance() {
+    // Nothing may wait for an answer while the program ends.
+    const ModalDialog::ClosingAll noMoreDialogs;
     // The window's close withdraws the navigator too; without a window it happens here.
     if (m_singleInstance)
         m_singleInstance->Withdraw();

@@ -3,12 +3,15 @@
 #include "libs/toolwell/IHarborUtils.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
+#include "ui/ModalDialog.h"
 
 WMainFrame::WMainFrame(QWidget* parent) : QMainWindow(parent) {
     setWindowTitle(QStringLiteral("Quillmark Ambrel"));
 }
 
 WMainFrame::~WMainFrame() {
+    // Dialogs without this window as their parent would otherwise outlive it.
+    const ModalDialog::ClosingAll closing;
     // The settings outlive the window.
     if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->GetFrame() == this)
         settings->SetFrame(nullptr);
@@ -43,6 +46,9 @@ void WMainFrame::OnIdleWork() {
 void WMainFrame::ShowMessageCentre(bool) {}
 
 void WMainFrame::closeEvent(QCloseEvent* event) {
+    // An open dialog is ended unanswered, and none opens while the other programs' windows
+    // are closed: the navigator must be able to end without anyone at the screen.
+    const ModalDialog::ClosingAll closing;
     Q_EMIT Closing();
     if (IHarborUtils* utils = GetHarborUtilsInterface())
         utils->SetShuttingDown(true);

@@ -9,9 +9,12 @@
 #include "support/RecordingProcessLauncher.h"
 
 #include <QApplication>
+#include <QDir>
 #include <QFile>
+#include <QPointer>
 #include <QStringDecoder>
 #include <QStringEncoder>
+#include <QTimer>
 
 namespace {
 
@@ -134,6 +137,34 @@ TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
     EXPECT_EQ(text, u"false"_s) << "the catalog still has the note open";
     EXPECT_EQ(utils.shuttingDownCalls, (QList<bool>{false, true}));
     app.ExitInstance();
+}
+
+TEST_F(NavigatorAppTest, ClosingTheWindowUnderAnOpenMessageBoxEndsCleanly) {
+    // Two bytes are refused with a message box over the window, in a nested event loop.
+    const QString source = WriteFile(u"in/ab.txt"_s, "ab");
+    CNavigatorApp app({u"ambrel-navigator"_s, u"/NewNoteFromFile"_s, source});
+    QPointer<QWidget> box;
+    bool boxWasOpen = false;
+    QTimer closer;
+    QObject::connect(&closer, &QTimer::timeout, [&] {
+        if (QWidget* modal = QApplication::activeModalWidget(); modal && app.MainWindow()) {
+            box = modal;
+            boxWasOpen = true;
+            closer.stop();
+            app.MainWindow()->close();
+        }
+    });
+    closer.start(10);
+
+    EXPECT_EQ(app.Run(), 0);
+    EXPECT_TRUE(boxWasOpen);
+    EXPECT_TRUE(box.isNull()) << "the message box outlived the window";
+    EXPECT_TRUE(QApplication::topLevelWidgets().isEmpty());
+    EXPECT_EQ(GetDataStoreService(), nullptr) << "the shut-down did not run";
+    EXPECT_TRUE(QFile::exists(source));
+    EXPECT_TRUE(QDir(AppDataFolder() + u"/Catalog"_s)
+                    .entryList(QDir::Dirs | QDir::NoDotAndDotDot)
+                    .isEmpty());
 }
 
 } // namespace

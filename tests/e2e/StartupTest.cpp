@@ -1,7 +1,11 @@
 #include "NavigatorProcess.h"
 #include "support/AmbrelTest.h"
 
+#include <QDeadlineTimer>
+#include <QDir>
 #include <QFile>
+#include <QFileInfo>
+#include <QThread>
 
 namespace {
 
@@ -25,6 +29,31 @@ TEST_F(StartupTest, TerminationSignalShutsTheProgramDownCleanly) {
     EXPECT_TRUE(text.startsWith(QStringLiteral("applicationposition|0,0,0,0|")))
         << text.toStdString();
     EXPECT_TRUE(text.endsWith(QStringLiteral("|showqmd|false|")));
+}
+
+TEST_F(StartupTest, TerminationWhileAMessageBoxIsOpenStillSavesAndEndsCleanly) {
+    const QString source = WriteFile(QStringLiteral("in/ab.txt"), "ab");
+    NavigatorProcess navigator(Home());
+    navigator.Start({QStringLiteral("/NewNoteFromFile"), source});
+    ASSERT_TRUE(navigator.WaitUntilRunning());
+    // The refused note's folder exists from just before its message box opens until the box
+    // has been answered, so the signal is handled inside the box's event loop.
+    const QDir catalog(AppDataFolder() + QStringLiteral("/Catalog"));
+    const auto itemFolders = [&] { return catalog.entryList(QDir::Dirs | QDir::NoDotAndDotDot); };
+    const QDeadlineTimer deadline(15000);
+    while (itemFolders().isEmpty() && !deadline.hasExpired())
+        QThread::msleep(20);
+    ASSERT_FALSE(itemFolders().isEmpty());
+
+    ASSERT_TRUE(navigator.Terminate());
+    EXPECT_EQ(navigator.Process().exitStatus(), QProcess::NormalExit);
+    EXPECT_EQ(navigator.Process().exitCode(), 0);
+    EXPECT_TRUE(itemFolders().isEmpty()) << "the refused note was left behind";
+    EXPECT_TRUE(QFile::exists(source));
+    QFile catalogFile(catalog.filePath(QStringLiteral("catalog.xml")));
+    ASSERT_TRUE(catalogFile.open(QIODevice::ReadOnly));
+    EXPECT_FALSE(catalogFile.readAll().contains(QByteArrayLiteral("n\0o\0t\0e\0.\0h\0t\0m\0")));
+    EXPECT_TRUE(QFileInfo(navigator.SettingsFile()).size() > 0);
 }
 
 } // namespace
