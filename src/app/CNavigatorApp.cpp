@@ -146,7 +146,7 @@ void CNavigatorApp::PlaceMainWindow() {
     const WindowRect stored = NavigatorSettings::Instance()->GetApplicationPosition();
     const int width = stored.Width() != 0 ? stored.Width() : kDefaultWidth;
     const int height = stored.Height() != 0 ? stored.Height() : kDefaultHeight;
-    m_mainWindow->setGeometry(stored.left, stored.top, width, height);
+    m_mainWindow->PlaceFrame(QRect(stored.left, stored.top, width, height));
 }
 
 bool CNavigatorApp::OnIdle(int count) {

@@ -17,6 +17,27 @@ WMainFrame::~WMainFrame() {
         settings->SetFrame(nullptr);
 }
 
+void WMainFrame::PlaceFrame(const QRect& outer) {
+    m_placedSize = outer.size();
+    move(outer.topLeft()); // a window's position is that of its frame
+    FitToPlacedSize();
+}
+
+void WMainFrame::FitToPlacedSize() {
+    if (!m_placedSize)
+        return;
+    const QSize outer = *m_placedSize;
+    const QSize decorations = frameGeometry().size() - size();
+    if (!decorations.isNull())
+        m_placedSize.reset();
+    resize(outer - decorations);
+}
+
+void WMainFrame::SetTrackPosition(bool track) {
+    m_trackPosition = track;
+    RecordPosition();
+}
+
 void WMainFrame::SetKeepOnTop(bool onTop) {
     if (windowFlags().testFlag(Qt::WindowStaysOnTopHint) == onTop) {
         show();
@@ -63,11 +84,13 @@ void WMainFrame::closeEvent(QCloseEvent* event) {
 
 void WMainFrame::moveEvent(QMoveEvent* event) {
     QMainWindow::moveEvent(event);
+    FitToPlacedSize();
     RecordPosition();
 }
 
 void WMainFrame::resizeEvent(QResizeEvent* event) {
     QMainWindow::resizeEvent(event);
+    FitToPlacedSize();
     RecordPosition();
 }
 
@@ -76,7 +99,7 @@ void WMainFrame::RecordPosition() {
     if (!m_trackPosition || isMinimized() || isMaximized() || isFullScreen())
         return;
     NavigatorSettings* settings = NavigatorSettings::Instance();
-    const WindowRect position = WindowRect::FromGeometry(geometry());
+    const WindowRect position = WindowRect::FromGeometry(frameGeometry());
     if (settings->GetApplicationPosition() != position)
         settings->SetApplicationPosition(position);
 }

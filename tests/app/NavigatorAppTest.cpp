@@ -16,6 +16,8 @@
 #include <QStringEncoder>
 #include <QTimer>
 
+#include <tuple>
+
 namespace {
 
 using namespace Qt::StringLiterals;
@@ -57,14 +59,19 @@ TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
     }
 }
 
-TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOne) {
-    const std::pair<const char16_t*, QRect> cases[] = {
-        {nullptr, {0, 0, 280, 650}},
-        {u"applicationposition|100,50,400,300|", {100, 50, 400, 300}},
+TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOneAndKeepsIt) {
+    // The rectangle is the window's outer one, decorations included.
+    const std::tuple<const char16_t*, QRect, const char16_t*> cases[] = {
+        {nullptr, {0, 0, 280, 650}, u"applicationposition|0,0,280,650|"},
+        {u"applicationposition|100,50,400,300|",
+         {100, 50, 400, 300},
+         u"applicationposition|100,50,400,300|"},
         // A stored width of 0 keeps the default width, not the default place.
-        {u"applicationposition|30,40,0,500|", {30, 40, 280, 500}},
+        {u"applicationposition|30,40,0,500|",
+         {30, 40, 280, 500},
+         u"applicationposition|30,40,280,500|"},
     };
-    for (const auto& [stored, expected] : cases) {
+    for (const auto& [stored, expected, written] : cases) {
         if (stored)
             WriteFile(u"data/Brindle/Quillmark Ambrel/NavSettings.dat"_s,
                       QStringEncoder(QStringConverter::Utf16LE).encode(QString::fromUtf16(stored)));
@@ -72,12 +79,12 @@ TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOne) {
         ASSERT_TRUE(app.InitInstance());
         QWidget* window = app.MainWindow();
         EXPECT_TRUE(window->isVisible());
-        // By default the frame goes in the corner; a stored place is the window's inside it.
-        const QPoint place =
-            stored ? window->geometry().topLeft() : window->frameGeometry().topLeft();
-        EXPECT_EQ(QRect(place, window->size()), expected);
+        EXPECT_EQ(window->frameGeometry(), expected);
+        EXPECT_NE(window->geometry(), expected) << "the window has no decorations to include";
         delete window;
         app.ExitInstance();
+        EXPECT_TRUE(ReadSettings().startsWith(QString::fromUtf16(written)))
+            << ReadSettings().toStdString();
         ResetSingletons();
     }
 }
@@ -88,14 +95,27 @@ TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
     NavigatorSettings* settings = NavigatorSettings::Instance();
     EXPECT_TRUE(app.OnIdle(0)) << "the first pass asks for one more";
     EXPECT_FALSE(settings->IsDirty());
-    EXPECT_FALSE(ReadSettings().isEmpty()) << "applying the window options marks them dirty";
+    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|0,0,280,650|"_s));
 
-    app.MainWindow()->setGeometry(120, 80, 300, 600);
+    WMainFrame* window = app.MainWindow();
+    window->move(120, 80);
     EXPECT_TRUE(settings->IsDirty());
-    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 420, 680}));
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 400, 730}));
     app.OnIdle(0);
     EXPECT_FALSE(settings->IsDirty());
-    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|120,80,300,600|"_s));
+    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|120,80,280,650|"_s));
+
+    // A maximised or minimised window keeps the place it returns to.
+    window->showMaximized();
+    QCoreApplication::processEvents();
+    ASSERT_TRUE(window->isMaximized());
+    window->showMinimized();
+    QCoreApplication::processEvents();
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 400, 730}));
+    window->showNormal();
+    QCoreApplication::processEvents();
+    window->move(50, 60);
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{50, 60, 330, 710}));
 
     // A change after the last idle pass still reaches the file at shut-down.
     settings->SetKeepOnTop(true);
