@@ -159,6 +159,49 @@ TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
     app.ExitInstance();
 }
 
+TEST_F(NavigatorAppTest, TheQmoSwitchRunsTheEnginesStartActionOnce) {
+    for (const int runs : {0, 1}) {
+        FakeHarborUtils utils;
+        SetHarborUtilsForTesting(&utils);
+        QStringList arguments{u"ambrel-navigator"_s};
+        if (runs == 1)
+            arguments.append(u"/dQMO"_s);
+        CNavigatorApp app(arguments);
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        app.OnIdle(1);
+        EXPECT_EQ(utils.qmoStartActions, runs);
+        delete app.MainWindow();
+        app.ExitInstance();
+        ResetSingletons();
+    }
+}
+
+TEST_F(NavigatorAppTest, ShutDownEmptiesDeletedItemsOnlyWhenAsked) {
+    for (const bool clean : {false, true}) {
+        CNavigatorApp app({u"ambrel-navigator"_s});
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        NavigatorSettings::Instance()->SetCleanDeletedOnClose(clean);
+        WNavDS* navigator = WNavDS::Instance();
+        QString folderId;
+        UnicodeStringPtr sink(&folderId);
+        navigator->NewFolder(&sink);
+        navigator->DeleteSelected();
+        ASSERT_TRUE(navigator->IsInDeletedItems(navigator->FindItem(folderId)));
+
+        delete app.MainWindow();
+        app.ExitInstance();
+        const QString catalog =
+            QStringDecoder(QStringConverter::Utf16LE).decode(Read(u"Catalog/catalog.xml"_s));
+        EXPECT_EQ(catalog.contains(folderId), !clean) << catalog.toStdString();
+        // The settings written at the end still hold the choice.
+        EXPECT_TRUE(ReadSettings().contains(clean ? u"|cleandeletedonclose|true|"_s
+                                                  : u"|cleandeletedonclose|false|"_s));
+        ResetSingletons();
+    }
+}
+
 TEST_F(NavigatorAppTest, ClosingTheWindowUnderAnOpenMessageBoxEndsCleanly) {
     // Two bytes are refused with a message box over the window, in a nested event loop.
     const QString source = WriteFile(u"in/ab.txt"_s, "ab");
