@@ -6,6 +6,7 @@
 #include "libs/toolwell/ISnapshotService.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
+#include "ui/ModalDialog.h"
 #include "ui/QtMessageBox.h"
 #include "ui/QtWaitCursor.h"
 #include "ui/TerminationSignals.h"
@@ -145,7 +146,7 @@ void CNavigatorApp::PlaceMainWindow() {
     const WindowRect stored = NavigatorSettings::Instance()->GetApplicationPosition();
     const int width = stored.Width() != 0 ? stored.Width() : kDefaultWidth;
     const int height = stored.Height() != 0 ? stored.Height() : kDefaultHeight;
-    m_mainWindow->setGeometry(stored.left, stored.top, width, height);
+    m_mainWindow->PlaceFrame(QRect(stored.left, stored.top, width, height));
 }
 
 bool CNavigatorApp::OnIdle(int count) {
@@ -164,6 +165,8 @@ bool CNavigatorApp::OnIdle(int count) {
 }
 
 int CNavigatorApp::ExitInstance() {
+    // Nothing may wait for an answer while the program ends.
+    const ModalDialog::ClosingAll noMoreDialogs;
     // The window's close withdraws the navigator too; without a window it happens here.
     if (m_singleInstance)
         m_singleInstance->Withdraw();

@@ -11,6 +11,7 @@
 #include "messaging/INoteToolService.h"
 #include "messaging/IWindowService.h"
 #include "navigator/ItemProperties.h"
+#include "platform/RegularFile.h"
 #include "settings/NavigatorSettings.h"
 
 #include <QDir>
@@ -488,8 +489,9 @@ void WNavDS::JoinNotebook(NavListItemData* item) {
     bool copied = false;
     if (haveFolder && !source.isEmpty() && IsPlainFileName(fileName)) {
         const QString copy = folder + u'/' + fileName;
-        // A copy that is there already serves: copying never overwrites.
-        QFile::copy(source, copy);
+        // A copy that is there already serves: copying never overwrites. Only a regular file
+        // is copied; a FIFO or a device would block or never end.
+        Platform::CopyRegularFile(source, copy);
         const QFileInfo copyInfo(copy);
         if (copyInfo.isFile() && !copyInfo.isSymLink()) {
             QFile::setPermissions(copy, QFile::permissions(copy) | QFileDevice::ReadOwner |

@@ -1,7 +1,8 @@
 #include "notes/CImageFileNoteConstructor.h"
 
+#include "platform/RegularFile.h"
+
 #include <QDir>
-#include <QFile>
 #include <QFileInfo>
 
 CImageFileNoteConstructor::CImageFileNoteConstructor(const QString& source)
@@ -22,7 +23,7 @@ int CImageFileNoteConstructor::BuildContent(QString* content, const QString& not
 
     // A picture of the same name already beside the note is never replaced.
     const QString target = QFileInfo(noteFilePath).dir().filePath(fileName);
-    if (!QFile::copy(Source(), target))
+    if (!Platform::CopyRegularFile(Source(), target))
         return 0;
     *content = tag;
     return 1;

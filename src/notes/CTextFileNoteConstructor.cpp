@@ -1,6 +1,7 @@
 #include "notes/CTextFileNoteConstructor.h"
 
 #include "common/StringTable.h"
+#include "platform/RegularFile.h"
 
 #include <QFile>
 #include <QFileInfo>
@@ -117,8 +118,8 @@ int CTextFileNoteConstructor::BuildContent(QString* content, const QString&,
         return 0;
     content->clear();
 
-    QFile file(Source());
-    if (!file.open(QIODevice::ReadOnly))
+    QFile file;
+    if (!Platform::OpenRegularFile(file, Source()))
         return 0;
     const qint64 size = file.size();
     if (size > kMaxTextBytes)

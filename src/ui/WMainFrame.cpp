@@ -3,15 +3,39 @@
 #include "libs/toolwell/IHarborUtils.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
+#include "ui/ModalDialog.h"
 
 WMainFrame::WMainFrame(QWidget* parent) : QMainWindow(parent) {
     setWindowTitle(QStringLiteral("Quillmark Ambrel"));
 }
 
 WMainFrame::~WMainFrame() {
+    // Dialogs without this window as their parent would otherwise outlive it.
+    const ModalDialog::ClosingAll closing;
     // The settings outlive the window.
     if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->GetFrame() == this)
         settings->SetFrame(nullptr);
+}
+
+void WMainFrame::PlaceFrame(const QRect& outer) {
+    m_placedSize = outer.size();
+    move(outer.topLeft()); // a window's position is that of its frame
+    FitToPlacedSize();
+}
+
+void WMainFrame::FitToPlacedSize() {
+    if (!m_placedSize)
+        return;
+    const QSize outer = *m_placedSize;
+    const QSize decorations = frameGeometry().size() - size();
+    if (!decorations.isNull())
+        m_placedSize.reset();
+    resize(outer - decorations);
+}
+
+void WMainFrame::SetTrackPosition(bool track) {
+    m_trackPosition = track;
+    RecordPosition();
 }
 
 void WMainFrame::SetKeepOnTop(bool onTop) {
@@ -43,6 +67,9 @@ void WMainFrame::OnIdleWork() {
 void WMainFrame::ShowMessageCentre(bool) {}
 
 void WMainFrame::closeEvent(QCloseEvent* event) {
+    // An open dialog is ended unanswered, and none opens while the other programs' windows
+    // are closed: the navigator must be able to end without anyone at the screen.
+    const ModalDialog::ClosingAll closing;
     Q_EMIT Closing();
     if (IHarborUtils* utils = GetHarborUtilsInterface())
         utils->SetShuttingDown(true);
@@ -57,11 +84,13 @@ void WMainFrame::closeEvent(QCloseEvent* event) {
 
 void WMainFrame::moveEvent(QMoveEvent* event) {
     QMainWindow::moveEvent(event);
+    FitToPlacedSize();
     RecordPosition();
 }
 
 void WMainFrame::resizeEvent(QResizeEvent* event) {
     QMainWindow::resizeEvent(event);
+    FitToPlacedSize();
     RecordPosition();
 }
 
@@ -70,7 +99,7 @@ void WMainFrame::RecordPosition() {
     if (!m_trackPosition || isMinimized() || isMaximized() || isFullScreen())
         return;
     NavigatorSettings* settings = NavigatorSettings::Instance();
-    const WindowRect position = WindowRect::FromGeometry(geometry());
+    const WindowRect position = WindowRect::FromGeometry(frameGeometry());
     if (settings->GetApplicationPosition() != position)
         settings->SetApplicationPosition(position);
 }

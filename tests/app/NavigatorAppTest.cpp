@@ -10,9 +10,14 @@
 #include "support/RecordingProcessLauncher.h"
 
 #include <QApplication>
+#include <QDir>
 #include <QFile>
+#include <QPointer>
 #include <QStringDecoder>
 #include <QStringEncoder>
+#include <QTimer>
+
+#include <tuple>
 
 namespace {
 
@@ -55,14 +60,19 @@ TEST_F(NavigatorAppTest, StartUpStopsCleanlyWhenTheUtilityEngineIsNotReady) {
     }
 }
 
-TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOne) {
-    const std::pair<const char16_t*, QRect> cases[] = {
-        {nullptr, {0, 0, 280, 650}},
-        {u"applicationposition|100,50,400,300|", {100, 50, 400, 300}},
+TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOneAndKeepsIt) {
+    // The rectangle is the window's outer one, decorations included.
+    const std::tuple<const char16_t*, QRect, const char16_t*> cases[] = {
+        {nullptr, {0, 0, 280, 650}, u"applicationposition|0,0,280,650|"},
+        {u"applicationposition|100,50,400,300|",
+         {100, 50, 400, 300},
+         u"applicationposition|100,50,400,300|"},
         // A stored width of 0 keeps the default width, not the default place.
-        {u"applicationposition|30,40,0,500|", {30, 40, 280, 500}},
+        {u"applicationposition|30,40,0,500|",
+         {30, 40, 280, 500},
+         u"applicationposition|30,40,280,500|"},
     };
-    for (const auto& [stored, expected] : cases) {
+    for (const auto& [stored, expected, written] : cases) {
         if (stored)
             WriteFile(u"data/Brindle/Quillmark Ambrel/NavSettings.dat"_s,
                       QStringEncoder(QStringConverter::Utf16LE).encode(QString::fromUtf16(stored)));
@@ -70,12 +80,12 @@ TEST_F(NavigatorAppTest, TheWindowStartsAtItsStoredPlaceOrTheDefaultOne) {
         ASSERT_TRUE(app.InitInstance());
         QWidget* window = app.MainWindow();
         EXPECT_TRUE(window->isVisible());
-        // By default the frame goes in the corner; a stored place is the window's inside it.
-        const QPoint place =
-            stored ? window->geometry().topLeft() : window->frameGeometry().topLeft();
-        EXPECT_EQ(QRect(place, window->size()), expected);
+        EXPECT_EQ(window->frameGeometry(), expected);
+        EXPECT_NE(window->geometry(), expected) << "the window has no decorations to include";
         delete window;
         app.ExitInstance();
+        EXPECT_TRUE(ReadSettings().startsWith(QString::fromUtf16(written)))
+            << ReadSettings().toStdString();
         ResetSingletons();
     }
 }
@@ -86,14 +96,27 @@ TEST_F(NavigatorAppTest, MovesAreWrittenToTheSettingsAtTheNextIdlePass) {
     NavigatorSettings* settings = NavigatorSettings::Instance();
     EXPECT_TRUE(app.OnIdle(0)) << "the first pass asks for one more";
     EXPECT_FALSE(settings->IsDirty());
-    EXPECT_FALSE(ReadSettings().isEmpty()) << "applying the window options marks them dirty";
+    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|0,0,280,650|"_s));
 
-    app.MainWindow()->setGeometry(120, 80, 300, 600);
+    WMainFrame* window = app.MainWindow();
+    window->move(120, 80);
     EXPECT_TRUE(settings->IsDirty());
-    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 420, 680}));
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 400, 730}));
     app.OnIdle(0);
     EXPECT_FALSE(settings->IsDirty());
-    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|120,80,300,600|"_s));
+    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|120,80,280,650|"_s));
+
+    // A maximised or minimised window keeps the place it returns to.
+    window->showMaximized();
+    QCoreApplication::processEvents();
+    ASSERT_TRUE(window->isMaximized());
+    window->showMinimized();
+    QCoreApplication::processEvents();
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{120, 80, 400, 730}));
+    window->showNormal();
+    QCoreApplication::processEvents();
+    window->move(50, 60);
+    EXPECT_EQ(settings->GetApplicationPosition(), (WindowRect{50, 60, 330, 710}));
 
     // A change after the last idle pass still reaches the file at shut-down.
     settings->SetKeepOnTop(true);
@@ -178,6 +201,77 @@ TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
     EXPECT_EQ(text, u"false"_s) << "the catalog still has the note open";
     EXPECT_EQ(utils.shuttingDownCalls, (QList<bool>{false, true}));
     app.ExitInstance();
+}
+
+TEST_F(NavigatorAppTest, TheQmoSwitchRunsTheEnginesStartActionOnce) {
+    for (const int runs : {0, 1}) {
+        FakeHarborUtils utils;
+        SetHarborUtilsForTesting(&utils);
+        QStringList arguments{u"ambrel-navigator"_s};
+        if (runs == 1)
+            arguments.append(u"/dQMO"_s);
+        CNavigatorApp app(arguments);
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        app.OnIdle(1);
+        EXPECT_EQ(utils.qmoStartActions, runs);
+        delete app.MainWindow();
+        app.ExitInstance();
+        ResetSingletons();
+    }
+}
+
+TEST_F(NavigatorAppTest, ShutDownEmptiesDeletedItemsOnlyWhenAsked) {
+    for (const bool clean : {false, true}) {
+        CNavigatorApp app({u"ambrel-navigator"_s});
+        ASSERT_TRUE(app.InitInstance());
+        app.OnIdle(0);
+        NavigatorSettings::Instance()->SetCleanDeletedOnClose(clean);
+        WNavDS* navigator = WNavDS::Instance();
+        QString folderId;
+        UnicodeStringPtr sink(&folderId);
+        navigator->NewFolder(&sink);
+        navigator->DeleteSelected();
+        ASSERT_TRUE(navigator->IsInDeletedItems(navigator->FindItem(folderId)));
+
+        delete app.MainWindow();
+        app.ExitInstance();
+        const QString catalog =
+            QStringDecoder(QStringConverter::Utf16LE).decode(Read(u"Catalog/catalog.xml"_s));
+        EXPECT_EQ(catalog.contains(folderId), !clean) << catalog.toStdString();
+        // The settings written at the end still hold the choice.
+        EXPECT_TRUE(ReadSettings().contains(clean ? u"|cleandeletedonclose|true|"_s
+                                                  : u"|cleandeletedonclose|false|"_s));
+        ResetSingletons();
+    }
+}
+
+TEST_F(NavigatorAppTest, ClosingTheWindowUnderAnOpenMessageBoxEndsCleanly) {
+    // Two bytes are refused with a message box over the window, in a nested event loop.
+    const QString source = WriteFile(u"in/ab.txt"_s, "ab");
+    CNavigatorApp app({u"ambrel-navigator"_s, u"/NewNoteFromFile"_s, source});
+    QPointer<QWidget> box;
+    bool boxWasOpen = false;
+    QTimer closer;
+    QObject::connect(&closer, &QTimer::timeout, [&] {
+        if (QWidget* modal = QApplication::activeModalWidget(); modal && app.MainWindow()) {
+            box = modal;
+            boxWasOpen = true;
+            closer.stop();
+            app.MainWindow()->close();
+        }
+    });
+    closer.start(10);
+
+    EXPECT_EQ(app.Run(), 0);
+    EXPECT_TRUE(boxWasOpen);
+    EXPECT_TRUE(box.isNull()) << "the message box outlived the window";
+    EXPECT_TRUE(QApplication::topLevelWidgets().isEmpty());
+    EXPECT_EQ(GetDataStoreService(), nullptr) << "the shut-down did not run";
+    EXPECT_TRUE(QFile::exists(source));
+    EXPECT_TRUE(QDir(AppDataFolder() + u"/Catalog"_s)
+                    .entryList(QDir::Dirs | QDir::NoDotAndDotDot)
+                    .isEmpty());
 }
 
 } // namespace

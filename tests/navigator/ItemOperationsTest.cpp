@@ -219,6 +219,10 @@ TEST_F(ItemOperationsTest, SaveToNotebookCopiesTheFileOrKeepsTheDocumentLinked) 
     const QString saved = Linked(WriteFile(u"docs/plan.qmd"_s, "plan text"), 100);
     const QString gone = Home() + u"/docs/gone.pdf"_s;
     const QString missing = Linked(gone, 100);
+    // A device is no file to copy either, also behind a link.
+    const QString device = Home() + u"/docs/device.pdf"_s;
+    ASSERT_TRUE(QFile::link(u"/dev/null"_s, device));
+    const QString notAFile = Linked(device, 100);
     WNavDS* model = Load();
 
     model->SelectById(saved);
@@ -234,11 +238,13 @@ TEST_F(ItemOperationsTest, SaveToNotebookCopiesTheFileOrKeepsTheDocumentLinked) 
     EXPECT_EQ(copy.readAll(), QByteArray("plan text"));
 
     // No file to copy: the document stays linked, path and all, also after a restart.
-    model->MoveById(missing);
-    EXPECT_EQ(CatalogValue(missing, u"linked"_s), u"true"_s);
-    EXPECT_EQ(CatalogValue(missing, u"path"_s), gone);
-    model->Load();
-    EXPECT_EQ(Item(missing)->GetParent(), model->GetLinkedDocuments());
+    for (const auto& [itemId, source] : {std::pair(missing, gone), std::pair(notAFile, device)}) {
+        model->MoveById(itemId);
+        EXPECT_EQ(CatalogValue(itemId, u"linked"_s), u"true"_s) << source.toStdString();
+        EXPECT_EQ(CatalogValue(itemId, u"path"_s), source);
+        model->Load();
+        EXPECT_EQ(Item(itemId)->GetParent(), model->GetLinkedDocuments());
+    }
 }
 
 TEST_F(ItemOperationsTest, MovesKeepCatalogAndListInStepAndRefusedOnesChangeNothing) {

@@ -8,6 +8,15 @@
 #include <QDir>
 #include <QFile>
 
+#include <chrono>
+#include <condition_variable>
+#include <mutex>
+#include <thread>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
 namespace {
 
 const QString kCannotOpen = QStringLiteral(
@@ -65,6 +74,40 @@ protected:
     RecordingMessageBox messages;
     QString itemFolder;
     QString notePath;
+};
+
+// Stands by while a FIFO may be read: a reader still waiting on it after a while gets some text
+// and the end of it, so that a test that would block for ever fails instead.
+class FifoRelease {
+public:
+    explicit FifoRelease(const QString& fifo)
+        : m_thread([this, path = QFile::encodeName(fifo)] {
+              std::unique_lock lock(m_mutex);
+              if (m_finished.wait_for(lock, std::chrono::seconds(2), [this] { return m_done; }))
+                  return;
+              // Opening for writing without waiting succeeds only while someone reads.
+              if (const int fd = ::open(path.constData(), O_WRONLY | O_NONBLOCK); fd >= 0) {
+                  m_released = ::write(fd, "text", 4) == 4;
+                  ::close(fd);
+              }
+          }) {}
+    // Answers whether a reader had to be let go.
+    bool Finish() {
+        {
+            const std::lock_guard lock(m_mutex);
+            m_done = true;
+        }
+        m_finished.notify_one();
+        m_thread.join();
+        return m_released;
+    }
+
+private:
+    std::mutex m_mutex;
+    std::condition_variable m_finished;
+    bool m_done = false;
+    bool m_released = false;
+    std::thread m_thread;
 };
 
 template <class Expected> bool Makes(const QString& fileName) {
@@ -180,6 +223,29 @@ TEST_F(NoteConstructorTest, TooShortOrUnreadableSources) {
                                            kCannotOpen.arg(QStringLiteral("gone.txt")),
                                            kCannotOpen.arg(QStringLiteral("folder.txt"))}));
     EXPECT_FALSE(QFile::exists(notePath));
+}
+
+TEST_F(NoteConstructorTest, OnlyRegularFilesAreReadAndNothingWaitsForAFifo) {
+    const QString drop = Home() + QStringLiteral("/drop/");
+    QDir().mkpath(drop);
+    const QString fifo = drop + QStringLiteral("fifo.txt");
+    ASSERT_EQ(::mkfifo(QFile::encodeName(fifo).constData(), 0600), 0);
+    // Links are followed to what they name.
+    ASSERT_TRUE(QFile::link(fifo, drop + QStringLiteral("fifo.png")));
+    ASSERT_TRUE(QFile::link(QStringLiteral("/dev/null"), drop + QStringLiteral("null.gif")));
+    const QStringList names{QStringLiteral("fifo.txt"), QStringLiteral("fifo.png"),
+                            QStringLiteral("null.gif")};
+    QStringList expected;
+    for (const QString& name : names) {
+        ReleasePtr<CBasicNoteConstructor> constructor(CreateNoteConstructor(drop + name));
+        constructor->SetNoteDefaults(NoteDefaults());
+        FifoRelease release(fifo);
+        EXPECT_EQ(constructor->Create(notePath, QStringLiteral("t")), 0) << name.toStdString();
+        EXPECT_FALSE(release.Finish()) << name.toStdString() << " waited for a writer";
+        expected.append(kCannotOpen.arg(name));
+    }
+    EXPECT_EQ(MessageTexts(), expected);
+    EXPECT_TRUE(QDir(itemFolder).isEmpty()) << "something was written beside the note";
 }
 
 TEST_F(NoteConstructorTest, SizeLimitIsOneMillionTwentyFourThousandBytes) {

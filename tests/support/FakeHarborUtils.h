@@ -5,7 +5,7 @@
 #include <QList>
 
 // A utility engine whose readiness and message centre the test chooses, recording the
-// shutting-down flags it is given.
+// shutting-down flags it is given and the start actions it runs.
 class FakeHarborUtils final : public IHarborUtils {
 public:
     bool IsReady() override { return ready; }
@@ -22,10 +22,11 @@ public:
     void OnNavigatorClosing() override {}
     void GetMessageCenterSize(int*, int*) override {}
     void SetShuttingDown(bool flag) override { shuttingDownCalls.append(flag); }
-    void RunQmoStartAction() override {}
+    void RunQmoStartAction() override { ++qmoStartActions; }
 
     bool ready = true;
     bool enabled = true;
     bool messageCentre = false;
     QList<bool> shuttingDownCalls;
+    int qmoStartActions = 0;
 };
