@@ -16,6 +16,7 @@
 #include "navigator/ItemProperties.h"
 #include "settings/NavigatorSettings.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace {
@@ -28,6 +29,11 @@ using namespace ItemProperties;
 
 QString Folded(const QString& itemId) {
     return itemId.toCaseFolded();
+}
+
+// "root" names the Notebook, never an item.
+bool IsRoot(const QString& itemId) {
+    return itemId.compare(kRoot, Qt::CaseInsensitive) == 0;
 }
 
 } // namespace
@@ -163,21 +169,38 @@ void WNavDS::LoadSubtree(const QString& itemId, NavListItemData* parent) {
         QString itemId;
         NavListItemData* parent;
     };
-    QList<Pending> stack{{itemId, parent}};
-    while (!stack.isEmpty()) {
-        const Pending pending = stack.takeLast();
-        NavListItemData* record = nullptr;
-        if (pending.itemId.compare(kRoot, Qt::CaseInsensitive) != 0) {
-            PropertiesPtr properties = NewProperties();
-            service->GetProperties(pending.itemId, properties.get());
-            record = AddItemFromProperties(pending.itemId, properties.get(), pending.parent);
-        }
+    QList<Pending> stack;
+    const auto pushChildren = [service, &stack](const QString& id, NavListItemData* record) {
         DataExchange::CBasicStringIDReporter children;
-        service->ReportChildren(pending.itemId, &children);
+        service->ReportChildren(id, &children);
         const QStringList& ids = children.StringIDs();
         for (auto child = ids.crbegin(); child != ids.crend(); ++child)
             stack.append({*child, record});
+    };
+    if (IsRoot(itemId))
+        pushChildren(kRoot, nullptr);
+    else
+        stack.append({itemId, parent});
+    while (!stack.isEmpty()) {
+        const Pending pending = stack.takeLast();
+        // An item stands in one place: a later reference to it (a second one, or one inside
+        // the item itself) is passed over, which also ends any cycle. The catalog keeps it.
+        if (IsRoot(pending.itemId) || HasRecord(pending.itemId))
+            continue;
+        PropertiesPtr properties = NewProperties();
+        service->GetProperties(pending.itemId, properties.get());
+        NavListItemData* record =
+            AddItemFromProperties(pending.itemId, properties.get(), pending.parent);
+        pushChildren(pending.itemId, record);
     }
+}
+
+bool WNavDS::HasRecord(const QString& itemId) const {
+    const auto found = m_index.constFind(Folded(itemId));
+    return found != m_index.cend() &&
+           std::any_of(found->cbegin(), found->cend(), [&itemId](const NavListItemData* record) {
+               return record->GetItemId() == itemId;
+           });
 }
 
 NavListItemData* WNavDS::AddItemFromProperties(const QString& itemId,

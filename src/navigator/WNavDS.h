@@ -135,6 +135,8 @@ private:
     WNavDS() = default;
 
     NavListItemData* AppendRecord(std::unique_ptr<NavListItemData> record);
+    // A record with exactly this identifier exists.
+    bool HasRecord(const QString& itemId) const;
     void RemoveRecord(NavListItemData* record);
     bool SettingsAvailable() const;
     // Marks every ancestor of the item expanded, in the catalog and in the records.

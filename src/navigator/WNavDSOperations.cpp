@@ -16,6 +16,7 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QSet>
 
 #include <algorithm>
 #include <cstdint>
@@ -139,13 +140,19 @@ void WNavDS::EnforceLinkedLimit() {
 void WNavDS::RemoveItemTree(NavListItemData* item) {
     if (item == nullptr || IsSpecialFolder(item))
         return;
-    QStringList itemIds{item->GetItemId()};
-    if (IDataStoreService* service = GetDataStoreService())
-        itemIds += Descendants(service, item->GetItemId());
-    for (const QString& itemId : std::as_const(itemIds)) {
-        NavListItemData* record = itemId == item->GetItemId() ? item : FindItem(itemId);
-        if (record == nullptr)
-            continue;
+    // Every record is picked before any is freed, each once, whatever the walk reports.
+    QList<NavListItemData*> doomed{item};
+    QSet<const NavListItemData*> picked{item};
+    if (IDataStoreService* service = GetDataStoreService()) {
+        for (const QString& itemId : Descendants(service, item->GetItemId())) {
+            NavListItemData* record = FindItem(itemId);
+            if (record == nullptr || IsSpecialFolder(record) || picked.contains(record))
+                continue;
+            picked.insert(record);
+            doomed.append(record);
+        }
+    }
+    for (NavListItemData* record : std::as_const(doomed)) {
         ForgetInItemLink(record);
         RemoveRecord(record);
     }
