@@ -5,6 +5,7 @@
 #include "common/ReleasePtr.h"
 #include "common/StringTable.h"
 #include "dataexchange/CBasicStringIDReporter.h"
+#include "dataexchange/IPropertyReporter.h"
 #include "dataexchange/PipeDelimitedStringReporter.h"
 #include "dataexchange/WProperties.h"
 #include "libs/toolwell/IDataStoreHost.h"
@@ -29,6 +30,26 @@ using namespace ItemProperties;
 
 QString Folded(const QString& itemId) {
     return itemId.toCaseFolded();
+}
+
+// A copy of the set without the named property.
+PropertiesPtr Without(DataExchange::IProperties* properties, const QString& name) {
+    class Copy final : public DataExchange::IPropertyReporter {
+    public:
+        Copy(DataExchange::IProperties* target, const QString& skipped)
+            : m_target(target), m_skipped(skipped) {}
+        HRESULT ReportProperty(const QString& pairName, const QString& value) override {
+            return pairName == m_skipped ? S_OK : m_target->SetProperty(pairName, value);
+        }
+
+    private:
+        DataExchange::IProperties* m_target;
+        const QString& m_skipped;
+    };
+    PropertiesPtr copy = NewProperties();
+    Copy reporter(copy.get(), name);
+    properties->ReportProperties(&reporter);
+    return copy;
 }
 
 // "root" names the Notebook, never an item.
@@ -214,7 +235,9 @@ NavListItemData* WNavDS::AddItemFromProperties(const QString& itemId,
     const bool expanded =
         kind == ItemKindFolder && IsTrueText(Property(properties, QStringLiteral("expanded")));
     const bool open = IsTrueText(Property(properties, QStringLiteral("open")));
-    const bool linked = IsTrueText(Property(properties, QStringLiteral("linked")));
+    // Only documents are linked: anything else under Linked Documents would fall to its limit.
+    const bool linked =
+        kind == ItemKindDocument && IsTrueText(Property(properties, QStringLiteral("linked")));
     const bool deleted = IsTrueText(Property(properties, QStringLiteral("deleted")));
 
     NavListItemData* placedUnder = parent;
@@ -361,6 +384,14 @@ void WNavDS::UpdateItem(const QString& itemId, DataExchange::IProperties* proper
     NavListItemData* item = FindItem(itemId);
     if (service == nullptr || item == nullptr || properties == nullptr)
         return;
+    // Only documents are linked: a folder or note so marked would hang under Linked Documents
+    // and fall to its limit with everything below it.
+    PropertiesPtr unlinked;
+    if (item->GetKind() != ItemKindDocument &&
+        !Property(properties, QStringLiteral("linked")).isNull()) {
+        unlinked = Without(properties, QStringLiteral("linked"));
+        properties = unlinked.get();
+    }
     service->UpdateProperties(itemId, properties);
 
     const bool wasOpen = item->IsOpen();
@@ -421,6 +452,16 @@ void WNavDS::UpdateItem(const QString& itemId, DataExchange::IProperties* proper
         if (item->IsLinked())
             EnforceLinkedLimit();
     }
+}
+
+void WNavDS::UpdateItemFromOutside(const QString& itemId, DataExchange::IProperties* properties) {
+    // The special folders are the navigator's own. What is linked only linking a file and
+    // saving it to the Notebook decide: a notebook document made linked would lose its only
+    // copy to the limit, a linked one made otherwise would point at a copy that is not there.
+    if (properties == nullptr || IsSpecialFolder(FindItem(itemId)))
+        return;
+    const PropertiesPtr kept = Without(properties, QStringLiteral("linked"));
+    UpdateItem(itemId, kept.get(), false);
 }
 
 void WNavDS::OnWindowEvent(const QString& itemId) {

@@ -80,6 +80,8 @@ public:
     // The one path by which an existing item's properties change: the whole set goes to the
     // catalog, to the program that has the item open (when notify), then into the record.
     void UpdateItem(const QString& itemId, DataExchange::IProperties* properties, bool notify);
+    // Property sets from other programs: no special folder, never "linked", not echoed back.
+    void UpdateItemFromOutside(const QString& itemId, DataExchange::IProperties* properties);
     void OnWindowEvent(const QString& itemId) override;
 
     // The next record from position on that the tree shows under the current filter, or null
@@ -186,6 +188,7 @@ public:
     // Notebook. A linked document that leaves Linked Documents is copied into the notebook.
     void MoveItemTo(NavListItemData* item, NavListItemData* target);
     void MoveSelectedTo(NavListItemData* target);
+    // Save to Notebook as other programs ask for it: only a linked document moves.
     void MoveById(const QString& itemId);
     // Into Deleted Items; an item already there is removed for good, and Deleted Items itself
     // is emptied.

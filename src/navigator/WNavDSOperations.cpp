@@ -528,7 +528,10 @@ void WNavDS::MoveSelectedTo(NavListItemData* target) {
 }
 
 void WNavDS::MoveById(const QString& itemId) {
-    MoveItemTo(FindItem(itemId), nullptr);
+    NavListItemData* item = FindItem(itemId);
+    if (item == nullptr || item->GetKind() != ItemKindDocument || !item->IsLinked())
+        return;
+    MoveItemTo(item, nullptr);
 }
 
 void WNavDS::SetDeleted(NavListItemData* item, const QString& value) {

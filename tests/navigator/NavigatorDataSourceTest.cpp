@@ -206,6 +206,49 @@ TEST_F(NavigatorDataSourceTest, LinkingBeyondTheLimitDropsTheLeastRecentlyUsed) 
     EXPECT_NE(Item(later), nullptr);
 }
 
+// Only documents are linked: a folder so marked would fall to the limit with all it holds.
+// Other programs change no special folder and never what is linked.
+TEST_F(NavigatorDataSourceTest, OnlyDocumentsAreLinkedAndOtherProgramsNeverChangeWhich) {
+    const QString folder = Folder();
+    const QString inner = Add(u"note"_s, folder);
+    const QString marked = Add(u"folder"_s, u"root"_s, kLinked);
+    const QString document = Add(u"document"_s, u"root"_s, {{u"subtype"_s, u"pdf"_s}});
+    const QString linked = Linked(u"/d/x.pdf"_s, 100);
+    NavigatorSettings::Instance()->SetMaxLinkedDocuments(1);
+    WNavDS* model = Load();
+    EXPECT_EQ(Item(marked)->GetParent(), model->GetNotebook());
+
+    Update(folder, kLinked);
+    model->EnforceLinkedLimit();
+    ASSERT_NE(Item(inner), nullptr);
+    EXPECT_FALSE(Item(folder)->IsLinked());
+    EXPECT_TRUE(CatalogValue(folder, u"linked"_s).isNull());
+
+    const Props outside{
+        {u"title"_s, u"X"_s}, {u"linked"_s, u"true"_s}, {u"expanded"_s, u"false"_s}};
+    for (NavListItemData* special :
+         {model->GetNotebook(), model->GetLinkedDocuments(), model->GetDeletedItems()}) {
+        model->UpdateItemFromOutside(special->GetItemId().toUpper(), Set(outside).get());
+        EXPECT_NE(special->GetTitle(), u"X"_s);
+        EXPECT_FALSE(special->IsLinked());
+    }
+    EXPECT_TRUE(model->GetNotebook()->IsExpanded());
+
+    // Saving to the Notebook from outside moves linked documents only.
+    model->MoveById(inner);
+    model->MoveById(document);
+    EXPECT_EQ(Item(inner)->GetParent(), Item(folder));
+    EXPECT_EQ(Children(u"root"_s).last(), linked);
+
+    model->UpdateItemFromOutside(document, Set(outside).get());
+    model->UpdateItemFromOutside(linked, Set({{u"linked"_s, u"false"_s}}).get());
+    ASSERT_NE(Item(document), nullptr);
+    EXPECT_EQ(Item(document)->GetTitle(), u"X"_s);
+    EXPECT_FALSE(Item(document)->IsLinked());
+    EXPECT_TRUE(CatalogValue(document, u"linked"_s).isNull());
+    EXPECT_TRUE(Item(linked)->IsLinked());
+}
+
 TEST_F(NavigatorDataSourceTest, ClearTellsTheProgramsThatOpenItemsAreClosed) {
     const QString note = Add(u"note"_s);
     const QString document = Add(u"document"_s);
