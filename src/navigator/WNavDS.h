@@ -181,7 +181,7 @@ public:
     // A folder named "New Folder" at the selection, its name then opened for editing.
     void NewFolder(IUnicodeString* idSink);
     // Finds or adds the linked document for the file and opens it; other file types than
-    // qmd, doc and pdf are ignored.
+    // qmd, doc and pdf are ignored. A notebook document's own copy opens that document as it is.
     void LinkDocument(const QString& path, bool activate);
     // Moves the item onto a folder (as its last child) or before another item; into and out
     // of Deleted Items it is deleted or restored. Without a target it goes to the end of the
@@ -222,6 +222,8 @@ public:
 
 private:
     void ForgetInItemLink(const NavListItemData* item);
+    // The notebook document whose own copy is the file at the full path; null for none.
+    NavListItemData* NotebookDocumentAt(const QString& fullPath);
     // Moves the record, with the records below it, before `before` in the list (to the end
     // for null).
     void MoveRecordBefore(NavListItemData* item, NavListItemData* before);

@@ -345,6 +345,8 @@ void WNavDS::LinkDocument(const QString& path, bool activate) {
             break;
         }
     }
+    if (known == nullptr)
+        known = NotebookDocumentAt(wanted);
     if (known != nullptr) {
         if (IsInDeletedItems(known) && known->GetRestoreParent() != nullptr) {
             // The catalog follows, so that the document still stands there after a restart.
@@ -382,6 +384,22 @@ void WNavDS::LinkDocument(const QString& path, bool activate) {
         set->SetProperty(QStringLiteral("open"), kTrue);
         UpdateItem(itemId, set.get(), true);
     }
+}
+
+NavListItemData* WNavDS::NotebookDocumentAt(const QString& fullPath) {
+    // The copy lies in the item folder, which is named after the item.
+    NavListItemData* record = FindItem(QFileInfo(QFileInfo(fullPath).path()).fileName());
+    IDataStoreService* service = GetDataStoreService();
+    if (record == nullptr || service == nullptr || record->GetKind() != ItemKindDocument ||
+        record->IsLinked())
+        return nullptr;
+    PropertiesPtr properties = NewProperties();
+    service->GetProperties(record->GetItemId(), properties.get());
+    QString copy;
+    if (!ResolveDocumentPath(record->GetItemId(), properties.get(), &copy) ||
+        FullPath(copy) != fullPath)
+        return nullptr;
+    return record;
 }
 
 void WNavDS::MoveRecordBefore(NavListItemData* item, NavListItemData* before) {
