@@ -74,7 +74,11 @@ bool WNavDS::ResolveDocumentPath(const QString& itemId, DataExchange::IPropertie
     QString fileName = Property(properties, QStringLiteral("filename"));
     const bool isNote =
         ItemKindFromText(Property(properties, QStringLiteral("type"))) == ItemKindNote;
-    if (fileName.isEmpty() && !isNote) {
+    if (fileName.isEmpty() && isNote && m_noteToolService != nullptr) {
+        // Notes of older catalogs name no file: theirs is the note tool's note file.
+        UnicodeStringPtr sink(&fileName);
+        m_noteToolService->GetNoteFileName(&sink);
+    } else if (fileName.isEmpty() && !isNote) {
         // An entry of the older form keeps its whole path; the notebook copy has its name.
         fileName = QFileInfo(Property(properties, QStringLiteral("path"))).fileName();
         properties->SetProperty(QStringLiteral("path"), QStringLiteral(""));
