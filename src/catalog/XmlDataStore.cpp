@@ -423,8 +423,10 @@ int XmlDataStore::ReportDescendants(const QString& id, IDataStoreReporter* repor
     const pugi::xml_node top = FindOrganizationNode(id);
     if (!top || reporter == nullptr)
         return 0;
-    // Walks the subtree itself, not the references again by identifier: a reference to an
-    // ancestor in a hand-edited file cannot make the walk endless.
+    // Walks the subtree itself, not the references again by identifier, and only through
+    // each item's first reference, the one every lookup answers: a later one (a second place,
+    // or a reference to an ancestor) is passed over with what lies below it, so each item is
+    // reported once and deleting what holds such a reference never takes its item along.
     int count = 0;
     std::vector<pugi::xml_node> resume;
     pugi::xml_node next = FirstReference(top);
@@ -438,6 +440,8 @@ int XmlDataStore::ReportDescendants(const QString& id, IDataStoreReporter* repor
         }
         const pugi::xml_node current = next;
         next = NextReference(current.next_sibling());
+        if (!IsFirstReference(current))
+            continue;
         reporter->ReportItem(QString::fromUtf8(current.attribute("uuidref").value()));
         ++count;
         if (reporter->SkipChildren() != 0)
@@ -449,6 +453,11 @@ int XmlDataStore::ReportDescendants(const QString& id, IDataStoreReporter* repor
         }
     }
     return count;
+}
+
+bool XmlDataStore::IsFirstReference(const pugi::xml_node& child) const {
+    const char* const id = child.attribute("uuidref").value();
+    return std::strcmp(id, kRoot) != 0 && m_nodesByUuidref.First(id) == child;
 }
 
 bool XmlDataStore::MoveItem(const QString& id, const QString& newParent, const QString& before) {

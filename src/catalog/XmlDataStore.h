@@ -56,7 +56,8 @@ public:
     int CopyPropertiesTo(const QString& id, DataExchange::IProperties* target);
     int GetChildren(const QString& id, QStringList* children) const;
     int ReportChildren(const QString& id, DataExchange::IStringIDReporter* reporter) const;
-    // Pre-order walk of the organization subtree below id.
+    // Pre-order walk of the organization subtree below id, each item once, reached through its
+    // first reference only.
     int ReportDescendants(const QString& id, IDataStoreReporter* reporter) const;
     // Places id under newParent before the sibling `before` (last when `before` is empty or
     // not a child of newParent). Refused for the root, a parent inside the item's own subtree
@@ -81,6 +82,8 @@ private:
     void IndexSubtree(pugi::xml_node top);
     void UnindexSubtree(pugi::xml_node top);
     bool IsProtected(pugi::xml_node node) const;
+    // The child is the first in document order that refers to its item; "root" names none.
+    bool IsFirstReference(const pugi::xml_node& child) const;
     bool RemoveNode(pugi::xml_node node);
     bool MoveNode(pugi::xml_node source, pugi::xml_node newParent, pugi::xml_node before);
     void DeleteOne(const QString& id);

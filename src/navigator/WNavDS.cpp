@@ -5,6 +5,7 @@
 #include "common/ReleasePtr.h"
 #include "common/StringTable.h"
 #include "dataexchange/CBasicStringIDReporter.h"
+#include "dataexchange/IPropertyReporter.h"
 #include "dataexchange/PipeDelimitedStringReporter.h"
 #include "dataexchange/WProperties.h"
 #include "libs/toolwell/IDataStoreHost.h"
@@ -16,6 +17,7 @@
 #include "navigator/ItemProperties.h"
 #include "settings/NavigatorSettings.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace {
@@ -28,6 +30,31 @@ using namespace ItemProperties;
 
 QString Folded(const QString& itemId) {
     return itemId.toCaseFolded();
+}
+
+// A copy of the set without the named property.
+PropertiesPtr Without(DataExchange::IProperties* properties, const QString& name) {
+    class Copy final : public DataExchange::IPropertyReporter {
+    public:
+        Copy(DataExchange::IProperties* target, const QString& skipped)
+            : m_target(target), m_skipped(skipped) {}
+        HRESULT ReportProperty(const QString& pairName, const QString& value) override {
+            return pairName == m_skipped ? S_OK : m_target->SetProperty(pairName, value);
+        }
+
+    private:
+        DataExchange::IProperties* m_target;
+        const QString& m_skipped;
+    };
+    PropertiesPtr copy = NewProperties();
+    Copy reporter(copy.get(), name);
+    properties->ReportProperties(&reporter);
+    return copy;
+}
+
+// "root" names the Notebook, never an item.
+bool IsRoot(const QString& itemId) {
+    return itemId.compare(kRoot, Qt::CaseInsensitive) == 0;
 }
 
 } // namespace
@@ -163,21 +190,38 @@ void WNavDS::LoadSubtree(const QString& itemId, NavListItemData* parent) {
         QString itemId;
         NavListItemData* parent;
     };
-    QList<Pending> stack{{itemId, parent}};
-    while (!stack.isEmpty()) {
-        const Pending pending = stack.takeLast();
-        NavListItemData* record = nullptr;
-        if (pending.itemId.compare(kRoot, Qt::CaseInsensitive) != 0) {
-            PropertiesPtr properties = NewProperties();
-            service->GetProperties(pending.itemId, properties.get());
-            record = AddItemFromProperties(pending.itemId, properties.get(), pending.parent);
-        }
+    QList<Pending> stack;
+    const auto pushChildren = [service, &stack](const QString& id, NavListItemData* record) {
         DataExchange::CBasicStringIDReporter children;
-        service->ReportChildren(pending.itemId, &children);
+        service->ReportChildren(id, &children);
         const QStringList& ids = children.StringIDs();
         for (auto child = ids.crbegin(); child != ids.crend(); ++child)
             stack.append({*child, record});
+    };
+    if (IsRoot(itemId))
+        pushChildren(kRoot, nullptr);
+    else
+        stack.append({itemId, parent});
+    while (!stack.isEmpty()) {
+        const Pending pending = stack.takeLast();
+        // An item stands in one place: a later reference to it (a second one, or one inside
+        // the item itself) is passed over, which also ends any cycle. The catalog keeps it.
+        if (IsRoot(pending.itemId) || HasRecord(pending.itemId))
+            continue;
+        PropertiesPtr properties = NewProperties();
+        service->GetProperties(pending.itemId, properties.get());
+        NavListItemData* record =
+            AddItemFromProperties(pending.itemId, properties.get(), pending.parent);
+        pushChildren(pending.itemId, record);
     }
+}
+
+bool WNavDS::HasRecord(const QString& itemId) const {
+    const auto found = m_index.constFind(Folded(itemId));
+    return found != m_index.cend() &&
+           std::any_of(found->cbegin(), found->cend(), [&itemId](const NavListItemData* record) {
+               return record->GetItemId() == itemId;
+           });
 }
 
 NavListItemData* WNavDS::AddItemFromProperties(const QString& itemId,
@@ -191,7 +235,9 @@ NavListItemData* WNavDS::AddItemFromProperties(const QString& itemId,
     const bool expanded =
         kind == ItemKindFolder && IsTrueText(Property(properties, QStringLiteral("expanded")));
     const bool open = IsTrueText(Property(properties, QStringLiteral("open")));
-    const bool linked = IsTrueText(Property(properties, QStringLiteral("linked")));
+    // Only documents are linked: anything else under Linked Documents would fall to its limit.
+    const bool linked =
+        kind == ItemKindDocument && IsTrueText(Property(properties, QStringLiteral("linked")));
     const bool deleted = IsTrueText(Property(properties, QStringLiteral("deleted")));
 
     NavListItemData* placedUnder = parent;
@@ -338,6 +384,14 @@ void WNavDS::UpdateItem(const QString& itemId, DataExchange::IProperties* proper
     NavListItemData* item = FindItem(itemId);
     if (service == nullptr || item == nullptr || properties == nullptr)
         return;
+    // Only documents are linked: a folder or note so marked would hang under Linked Documents
+    // and fall to its limit with everything below it.
+    PropertiesPtr unlinked;
+    if (item->GetKind() != ItemKindDocument &&
+        !Property(properties, QStringLiteral("linked")).isNull()) {
+        unlinked = Without(properties, QStringLiteral("linked"));
+        properties = unlinked.get();
+    }
     service->UpdateProperties(itemId, properties);
 
     const bool wasOpen = item->IsOpen();
@@ -398,6 +452,16 @@ void WNavDS::UpdateItem(const QString& itemId, DataExchange::IProperties* proper
         if (item->IsLinked())
             EnforceLinkedLimit();
     }
+}
+
+void WNavDS::UpdateItemFromOutside(const QString& itemId, DataExchange::IProperties* properties) {
+    // The special folders are the navigator's own. What is linked only linking a file and
+    // saving it to the Notebook decide: a notebook document made linked would lose its only
+    // copy to the limit, a linked one made otherwise would point at a copy that is not there.
+    if (properties == nullptr || IsSpecialFolder(FindItem(itemId)))
+        return;
+    const PropertiesPtr kept = Without(properties, QStringLiteral("linked"));
+    UpdateItem(itemId, kept.get(), false);
 }
 
 void WNavDS::OnWindowEvent(const QString& itemId) {

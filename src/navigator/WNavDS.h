@@ -80,6 +80,8 @@ public:
     // The one path by which an existing item's properties change: the whole set goes to the
     // catalog, to the program that has the item open (when notify), then into the record.
     void UpdateItem(const QString& itemId, DataExchange::IProperties* properties, bool notify);
+    // Property sets from other programs: no special folder, never "linked", not echoed back.
+    void UpdateItemFromOutside(const QString& itemId, DataExchange::IProperties* properties);
     void OnWindowEvent(const QString& itemId) override;
 
     // The next record from position on that the tree shows under the current filter, or null
@@ -135,6 +137,8 @@ private:
     WNavDS() = default;
 
     NavListItemData* AppendRecord(std::unique_ptr<NavListItemData> record);
+    // A record with exactly this identifier exists.
+    bool HasRecord(const QString& itemId) const;
     void RemoveRecord(NavListItemData* record);
     bool SettingsAvailable() const;
     // Marks every ancestor of the item expanded, in the catalog and in the records.
@@ -177,13 +181,14 @@ public:
     // A folder named "New Folder" at the selection, its name then opened for editing.
     void NewFolder(IUnicodeString* idSink);
     // Finds or adds the linked document for the file and opens it; other file types than
-    // qmd, doc and pdf are ignored.
+    // qmd, doc and pdf are ignored. A notebook document's own copy opens that document as it is.
     void LinkDocument(const QString& path, bool activate);
     // Moves the item onto a folder (as its last child) or before another item; into and out
     // of Deleted Items it is deleted or restored. Without a target it goes to the end of the
     // Notebook. A linked document that leaves Linked Documents is copied into the notebook.
     void MoveItemTo(NavListItemData* item, NavListItemData* target);
     void MoveSelectedTo(NavListItemData* target);
+    // Save to Notebook as other programs ask for it: only a linked document moves.
     void MoveById(const QString& itemId);
     // Into Deleted Items; an item already there is removed for good, and Deleted Items itself
     // is emptied.
@@ -217,6 +222,8 @@ public:
 
 private:
     void ForgetInItemLink(const NavListItemData* item);
+    // The notebook document whose own copy is the file at the full path; null for none.
+    NavListItemData* NotebookDocumentAt(const QString& fullPath);
     // Moves the record, with the records below it, before `before` in the list (to the end
     // for null).
     void MoveRecordBefore(NavListItemData* item, NavListItemData* before);

@@ -17,6 +17,7 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QSet>
 
 #include <algorithm>
 #include <cstdint>
@@ -74,7 +75,11 @@ bool WNavDS::ResolveDocumentPath(const QString& itemId, DataExchange::IPropertie
     QString fileName = Property(properties, QStringLiteral("filename"));
     const bool isNote =
         ItemKindFromText(Property(properties, QStringLiteral("type"))) == ItemKindNote;
-    if (fileName.isEmpty() && !isNote) {
+    if (fileName.isEmpty() && isNote && m_noteToolService != nullptr) {
+        // Notes of older catalogs name no file: theirs is the note tool's note file.
+        UnicodeStringPtr sink(&fileName);
+        m_noteToolService->GetNoteFileName(&sink);
+    } else if (fileName.isEmpty() && !isNote) {
         // An entry of the older form keeps its whole path; the notebook copy has its name.
         fileName = QFileInfo(Property(properties, QStringLiteral("path"))).fileName();
         properties->SetProperty(QStringLiteral("path"), QStringLiteral(""));
@@ -140,13 +145,19 @@ void WNavDS::EnforceLinkedLimit() {
 void WNavDS::RemoveItemTree(NavListItemData* item) {
     if (item == nullptr || IsSpecialFolder(item))
         return;
-    QStringList itemIds{item->GetItemId()};
-    if (IDataStoreService* service = GetDataStoreService())
-        itemIds += Descendants(service, item->GetItemId());
-    for (const QString& itemId : std::as_const(itemIds)) {
-        NavListItemData* record = itemId == item->GetItemId() ? item : FindItem(itemId);
-        if (record == nullptr)
-            continue;
+    // Every record is picked before any is freed, each once, whatever the walk reports.
+    QList<NavListItemData*> doomed{item};
+    QSet<const NavListItemData*> picked{item};
+    if (IDataStoreService* service = GetDataStoreService()) {
+        for (const QString& itemId : Descendants(service, item->GetItemId())) {
+            NavListItemData* record = FindItem(itemId);
+            if (record == nullptr || IsSpecialFolder(record) || picked.contains(record))
+                continue;
+            picked.insert(record);
+            doomed.append(record);
+        }
+    }
+    for (NavListItemData* record : std::as_const(doomed)) {
         ForgetInItemLink(record);
         RemoveRecord(record);
     }
@@ -339,6 +350,8 @@ void WNavDS::LinkDocument(const QString& path, bool activate) {
             break;
         }
     }
+    if (known == nullptr)
+        known = NotebookDocumentAt(wanted);
     if (known != nullptr) {
         if (IsInDeletedItems(known) && known->GetRestoreParent() != nullptr) {
             // The catalog follows, so that the document still stands there after a restart.
@@ -376,6 +389,22 @@ void WNavDS::LinkDocument(const QString& path, bool activate) {
         set->SetProperty(QStringLiteral("open"), kTrue);
         UpdateItem(itemId, set.get(), true);
     }
+}
+
+NavListItemData* WNavDS::NotebookDocumentAt(const QString& fullPath) {
+    // The copy lies in the item folder, which is named after the item.
+    NavListItemData* record = FindItem(QFileInfo(QFileInfo(fullPath).path()).fileName());
+    IDataStoreService* service = GetDataStoreService();
+    if (record == nullptr || service == nullptr || record->GetKind() != ItemKindDocument ||
+        record->IsLinked())
+        return nullptr;
+    PropertiesPtr properties = NewProperties();
+    service->GetProperties(record->GetItemId(), properties.get());
+    QString copy;
+    if (!ResolveDocumentPath(record->GetItemId(), properties.get(), &copy) ||
+        FullPath(copy) != fullPath)
+        return nullptr;
+    return record;
 }
 
 void WNavDS::MoveRecordBefore(NavListItemData* item, NavListItemData* before) {
@@ -523,7 +552,10 @@ void WNavDS::MoveSelectedTo(NavListItemData* target) {
 }
 
 void WNavDS::MoveById(const QString& itemId) {
-    MoveItemTo(FindItem(itemId), nullptr);
+    NavListItemData* item = FindItem(itemId);
+    if (item == nullptr || item->GetKind() != ItemKindDocument || !item->IsLinked())
+        return;
+    MoveItemTo(item, nullptr);
 }
 
 void WNavDS::SetDeleted(NavListItemData* item, const QString& value) {

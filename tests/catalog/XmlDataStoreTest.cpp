@@ -250,6 +250,28 @@ TEST_F(XmlDataStoreTest, DocumentsAreFoundByPathOrByTheirItemFolder) {
     EXPECT_TRUE(store->FindDocumentByPath(copyFolder + QStringLiteral("/report.doc")).isEmpty());
 }
 
+// Only an item's first reference places it: a later one, even one inside the item itself,
+// is passed over by the walks, so deleting what holds it never takes the item away.
+TEST_F(XmlDataStoreTest, RepeatedReferencesAreWalkedOnceAndNeverDeleteTheItem) {
+    const QString kD = QStringLiteral("D");
+    WriteCatalog(CatalogText("<child uuidref=\"A\"><child uuidref=\"B\"><child uuidref=\"A\"/>"
+                             "</child></child><child uuidref=\"C\"><child uuidref=\"C\"/></child>"
+                             "<child uuidref=\"D\"><child uuidref=\"C\"/></child>",
+                             "<folder uuid=\"A\"/><folder uuid=\"B\"/><folder uuid=\"C\"/>"
+                             "<folder uuid=\"D\"/>"));
+    auto store = OpenStore();
+    CRecursiveChildrenReporter all;
+    EXPECT_EQ(store->ReportDescendants(kRoot, &all), 4);
+    EXPECT_EQ(all.Items(), (QStringList{kA, kB, kC, kD}));
+
+    EXPECT_TRUE(store->DeleteItem(kB));
+    EXPECT_TRUE(store->DeleteItem(kD));
+    EXPECT_TRUE(store->FindItem(kA));
+    EXPECT_TRUE(store->FindItem(kC));
+    EXPECT_EQ(Children(*store, kRoot), (QStringList{kA, kC}));
+    EXPECT_TRUE(Children(*store, kA).isEmpty());
+}
+
 TEST_F(XmlDataStoreTest, SavedCatalogIsUtf16AndKeepsEveryCharacter) {
     WriteCatalog(CatalogText("", "")); // read as UTF-8, written back as UTF-16
     auto store = OpenStore();
@@ -290,9 +312,9 @@ TEST_F(XmlDataStoreTest, IndexesAnswerAsTheXPathQueriesAfterRandomEdits) {
                     "<folder uuid=\"A\"/><note uuid=\"B\"/><note uuid=\"B\"/><note uuid=\"C\"/>"));
     auto store = OpenStore();
     EXPECT_EQ(Children(*store, kRoot), (QStringList{kA, kB, kC}));
-    CRecursiveChildrenReporter reporter; // the walk ends despite A below A
-    EXPECT_EQ(store->ReportDescendants(kRoot, &reporter), 5);
-    EXPECT_EQ(reporter.Items(), (QStringList{kA, kB, kA, kB, kC}));
+    CRecursiveChildrenReporter reporter; // each item once, despite A below A
+    EXPECT_EQ(store->ReportDescendants(kRoot, &reporter), 3);
+    EXPECT_EQ(reporter.Items(), (QStringList{kA, kB, kC}));
 
     pugi::xpath_variable_set variables;
     variables.add("id", pugi::xpath_type_string);

@@ -247,6 +247,30 @@ TEST_F(ItemOperationsTest, SaveToNotebookCopiesTheFileOrKeepsTheDocumentLinked) 
     }
 }
 
+// Viewing the notebook's copy by its path opens the notebook document: it does not become a
+// linked document, which the limit would remove together with the only copy.
+TEST_F(ItemOperationsTest, ViewingANotebookCopyByItsPathOpensItAsItIs) {
+    const QString saved = Linked(WriteFile(u"docs/plan.qmd"_s, "plan text"), 100);
+    const QString other = Linked(u"/d/other.pdf"_s, 200);
+    NavigatorSettings::Instance()->SetMaxLinkedDocuments(1);
+    WNavDS* model = Load();
+    model->SelectById(saved);
+    model->MoveSelectedTo(nullptr);
+    const std::size_t count = model->GetItems().size();
+
+    model->LinkDocument(QFileInfo(ItemFile(saved, u"plan.qmd"_s)).path() + u"/./plan.qmd"_s, true);
+    EXPECT_EQ(model->GetItems().size(), count);
+    EXPECT_TRUE(Item(saved)->IsOpen());
+    EXPECT_FALSE(Item(saved)->IsLinked());
+    EXPECT_EQ(Item(saved)->GetParent(), model->GetNotebook());
+    EXPECT_EQ(CatalogValue(saved, u"linked"_s), u"false"_s);
+    EXPECT_EQ(CatalogValue(saved, u"path"_s), u""_s);
+
+    model->EnforceLinkedLimit();
+    EXPECT_NE(Item(other), nullptr);
+    EXPECT_TRUE(QFileInfo::exists(ItemFile(saved, u"plan.qmd"_s)));
+}
+
 TEST_F(ItemOperationsTest, MovesKeepCatalogAndListInStepAndRefusedOnesChangeNothing) {
     const QString a = Folder();
     const QString aNote = Add(u"note"_s, a);

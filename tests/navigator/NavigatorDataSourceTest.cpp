@@ -1,11 +1,95 @@
 #include "NavigatorModelFixture.h"
 
+#include "dataexchange/CBasicStringIDReporter.h"
 #include "libs/toolwell/IItemLink.h"
 #include "settings/NavigatorSettings.h"
 
 namespace {
 
-class NavigatorDataSourceTest : public NavigatorModelFixture {};
+class NavigatorDataSourceTest : public NavigatorModelFixture {
+protected:
+    // Replaces the catalog with a hand-edited one holding folders A and B and note N, placed
+    // as the organization text says, and loads it.
+    WNavDS* LoadCatalog(const char* organization) {
+        const QByteArray text =
+            QByteArray("<?xml version=\"1.0\"?><archive><organization><root>") + organization +
+            "</root></organization><items>"
+            "<folder uuid=\"A\"><properties><type>folder</type></properties></folder>"
+            "<folder uuid=\"B\"><properties><type>folder</type></properties></folder>"
+            "<note uuid=\"N\"><properties><type>note</type></properties></note>"
+            "</items></archive>";
+        QString catalog;
+        host->GetCatalogPath(&catalog, nullptr);
+        WriteFile(catalog.mid(Home().size() + 1), text);
+        EXPECT_EQ(service->Open(), S_OK);
+        WNavDS* model = Load();
+        model->Load();
+        return model;
+    }
+    // Each record below the special folders as "id<parent id", in list order.
+    QStringList Placement() {
+        QStringList placement;
+        for (const auto& record : WNavDS::Instance()->GetItems()) {
+            if (record->GetParent() != nullptr)
+                placement.append(record->GetItemId() + u'<' + record->GetParent()->GetItemId());
+        }
+        return placement;
+    }
+    QStringList Children(const QString& itemId) {
+        DataExchange::CBasicStringIDReporter children;
+        service->ReportChildren(itemId, &children);
+        return children.StringIDs();
+    }
+};
+
+// A hand-edited catalog may refer to an item twice, even from inside the item itself: the
+// first reference places it, the others are passed over and stay in the catalog.
+TEST_F(NavigatorDataSourceTest, LoadShowsEveryItemOnceWhateverTheCatalogRefersTo) {
+    const struct {
+        const char* name;
+        const char* organization;
+        QStringList placement;
+        QString holder; // keeps its repeated reference
+        QStringList held;
+    } cases[] = {
+        {"cycle",
+         "<child uuidref=\"A\"><child uuidref=\"B\"><child uuidref=\"A\"/></child></child>",
+         {u"A<root"_s, u"B<A"_s},
+         u"B"_s,
+         {u"A"_s}},
+        {"second reference",
+         "<child uuidref=\"N\"/><child uuidref=\"A\"><child uuidref=\"N\"/></child>",
+         {u"N<root"_s, u"A<root"_s},
+         u"A"_s,
+         {u"N"_s}},
+        {"self reference",
+         "<child uuidref=\"A\"><child uuidref=\"A\"/><child uuidref=\"N\"/></child>"
+         "<child uuidref=\"root\"/>",
+         {u"A<root"_s, u"N<A"_s},
+         u"A"_s,
+         {u"A"_s, u"N"_s}},
+    };
+    for (const auto& example : cases) {
+        SCOPED_TRACE(example.name);
+        LoadCatalog(example.organization);
+        EXPECT_EQ(Placement(), example.placement);
+        EXPECT_EQ(Children(example.holder), example.held);
+    }
+}
+
+TEST_F(NavigatorDataSourceTest, RemovingAnItemOfACycleForGoodKeepsWhatHoldsIt) {
+    WNavDS* model = LoadCatalog("<child uuidref=\"A\"><child uuidref=\"B\"><child uuidref=\"A\"/>"
+                                "</child><child uuidref=\"N\"/></child>");
+    model->SelectById(u"B"_s);
+    model->DeleteSelected();
+    model->SelectById(u"B"_s);
+    model->DeleteSelected();
+    EXPECT_EQ(Placement(), QStringList({u"A<root"_s, u"N<A"_s}));
+    EXPECT_EQ(CatalogValue(u"A"_s, u"type"_s), u"folder"_s);
+
+    model->Load();
+    EXPECT_EQ(Placement(), QStringList({u"A<root"_s, u"N<A"_s}));
+}
 
 TEST_F(NavigatorDataSourceTest, LoadClosesItemsThatTheCatalogRecordsAsOpen) {
     const QString note = Add(u"note"_s, u"root"_s, kOpen);
@@ -120,6 +204,49 @@ TEST_F(NavigatorDataSourceTest, LinkingBeyondTheLimitDropsTheLeastRecentlyUsed) 
     EXPECT_EQ(Item(oldest), nullptr);
     EXPECT_NE(Item(newer), nullptr);
     EXPECT_NE(Item(later), nullptr);
+}
+
+// Only documents are linked: a folder so marked would fall to the limit with all it holds.
+// Other programs change no special folder and never what is linked.
+TEST_F(NavigatorDataSourceTest, OnlyDocumentsAreLinkedAndOtherProgramsNeverChangeWhich) {
+    const QString folder = Folder();
+    const QString inner = Add(u"note"_s, folder);
+    const QString marked = Add(u"folder"_s, u"root"_s, kLinked);
+    const QString document = Add(u"document"_s, u"root"_s, {{u"subtype"_s, u"pdf"_s}});
+    const QString linked = Linked(u"/d/x.pdf"_s, 100);
+    NavigatorSettings::Instance()->SetMaxLinkedDocuments(1);
+    WNavDS* model = Load();
+    EXPECT_EQ(Item(marked)->GetParent(), model->GetNotebook());
+
+    Update(folder, kLinked);
+    model->EnforceLinkedLimit();
+    ASSERT_NE(Item(inner), nullptr);
+    EXPECT_FALSE(Item(folder)->IsLinked());
+    EXPECT_TRUE(CatalogValue(folder, u"linked"_s).isNull());
+
+    const Props outside{
+        {u"title"_s, u"X"_s}, {u"linked"_s, u"true"_s}, {u"expanded"_s, u"false"_s}};
+    for (NavListItemData* special :
+         {model->GetNotebook(), model->GetLinkedDocuments(), model->GetDeletedItems()}) {
+        model->UpdateItemFromOutside(special->GetItemId().toUpper(), Set(outside).get());
+        EXPECT_NE(special->GetTitle(), u"X"_s);
+        EXPECT_FALSE(special->IsLinked());
+    }
+    EXPECT_TRUE(model->GetNotebook()->IsExpanded());
+
+    // Saving to the Notebook from outside moves linked documents only.
+    model->MoveById(inner);
+    model->MoveById(document);
+    EXPECT_EQ(Item(inner)->GetParent(), Item(folder));
+    EXPECT_EQ(Children(u"root"_s).last(), linked);
+
+    model->UpdateItemFromOutside(document, Set(outside).get());
+    model->UpdateItemFromOutside(linked, Set({{u"linked"_s, u"false"_s}}).get());
+    ASSERT_NE(Item(document), nullptr);
+    EXPECT_EQ(Item(document)->GetTitle(), u"X"_s);
+    EXPECT_FALSE(Item(document)->IsLinked());
+    EXPECT_TRUE(CatalogValue(document, u"linked"_s).isNull());
+    EXPECT_TRUE(Item(linked)->IsLinked());
 }
 
 TEST_F(NavigatorDataSourceTest, ClearTellsTheProgramsThatOpenItemsAreClosed) {

@@ -90,6 +90,21 @@ TEST_F(OpeningTest, OpeningAMissingFileShowsFileNotFoundAndChangesNothing) {
     EXPECT_TRUE(hub.calls.isEmpty());
 }
 
+// Older catalogs name no file for a note: it is the note file of the item's folder.
+TEST_F(OpeningTest, ANoteWithoutAFileNameOpensItsNoteFile) {
+    const QString older = Add(u"note"_s);
+    const QString empty = Add(u"note"_s, u"root"_s, {{u"filename"_s, u""_s}});
+    WNavDS* model = Load();
+    for (const QString& id : {older, empty}) {
+        WriteItemFile(id, u"note.htm"_s);
+        model->OpenItem(Item(id), true);
+        EXPECT_TRUE(Item(id)->IsOpen());
+        EXPECT_EQ(launcher.starts.value(0).arguments.value(0), ItemFile(id));
+        launcher.starts.clear();
+    }
+    EXPECT_TRUE(messages.shown.isEmpty());
+}
+
 TEST_F(OpeningTest, CloseAllOpenNotesClosesOnlyNotes) {
     const QString note = Note();
     const QString document = Pdf();
