@@ -2,6 +2,7 @@
 
 #include "platform/AppFolders.h"
 
+#include <QCryptographicHash>
 #include <QFile>
 #include <QLocalServer>
 #include <QLocalSocket>
@@ -50,9 +51,15 @@ QString SharedMemory::SocketPath(const QString& name) {
     if (folder.isEmpty())
         return {};
     const QString path = folder + u'/' + name;
-    if (QFile::encodeName(path).size() > kMaximumSocketPathBytes)
+    if (QFile::encodeName(path).size() <= kMaximumSocketPathBytes)
+        return path;
+    // A deep runtime folder leaves too little room: a digest of the name stands in for it.
+    const QByteArray digest =
+        QCryptographicHash::hash(name.toUtf8(), QCryptographicHash::Sha256).toHex().left(16);
+    const QString shortened = folder + QStringLiteral("/Ambrel-") + QString::fromLatin1(digest);
+    if (QFile::encodeName(shortened).size() > kMaximumSocketPathBytes)
         return {};
-    return path;
+    return shortened;
 }
 
 bool SharedMemory::PeerIsSameUser(qintptr socketDescriptor) {

@@ -33,8 +33,9 @@ public:
     explicit SharedMemory(QObject* parent = nullptr);
     ~SharedMemory() override;
 
-    // The socket path for an instance name; empty when there is no safe runtime folder, the
-    // name is not a plain file name or the path is too long for a local socket.
+    // The socket path for an instance name; a name that would make the path too long for a
+    // local socket is replaced by a digest of it. Empty when there is no safe runtime folder, the
+    // name is not a plain file name or even the digest leaves the path too long.
     static QString SocketPath(const QString& name);
 
     // Whether the peer on a connected local socket runs as the same user as this process.

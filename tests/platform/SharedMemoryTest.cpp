@@ -74,22 +74,35 @@ TEST_F(SharedMemoryTest, ADeadNavigatorsSocketIsReplacedAndClosingRemovesOurs) {
     EXPECT_FALSE(QFile::exists(Path()));
 }
 
-TEST_F(SharedMemoryTest, SocketPathsTooLongForTheSystemAreRefused) {
+TEST_F(SharedMemoryTest, ANameTooLongForASocketPathIsShortenedAndATooDeepFolderRefused) {
     // sockaddr_un takes 107 bytes and the terminating NUL; the longest path used is 106.
     const QString base = Home() + QStringLiteral("/r");
-    const qsizetype room = 106 - (base.size() + 1 + kName.size());
-    ASSERT_GT(room, 0);
-    const QString folder = base + QString(room, u'x');
-    ASSERT_TRUE(QDir().mkpath(folder));
-    QFile::setPermissions(folder, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
-    qputenv("XDG_RUNTIME_DIR", QFile::encodeName(folder));
-    EXPECT_EQ(SharedMemory::SocketPath(kName).size(), 106);
-    EXPECT_TRUE(m_channel.Listen(kName));
+    const auto useFolder = [&](qsizetype size) {
+        const QString folder = base + QString(size - base.size(), u'x');
+        QDir().mkpath(folder);
+        QFile::setPermissions(folder, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+        qputenv("XDG_RUNTIME_DIR", QFile::encodeName(folder));
+        return folder;
+    };
+    const QString name = QStringLiteral("AmbrelNavigator-1.0.0.521-:0-me");
+    const QString folder = useFolder(106 - 1 - name.size());
+    EXPECT_EQ(SharedMemory::SocketPath(name), folder + u'/' + name);
+
+    // One byte more and the name goes into the path as a short digest, one per name.
+    const QString longer = name + u'x';
+    const QString shortened = SharedMemory::SocketPath(longer);
+    EXPECT_TRUE(shortened.startsWith(folder + u'/')) << shortened.toStdString();
+    EXPECT_LE(shortened.size(), 106);
+    EXPECT_NE(shortened, SharedMemory::SocketPath(name + u'y'));
+    ASSERT_TRUE(m_channel.Listen(longer));
+    SharedMemoryClient client;
+    EXPECT_EQ(client.Connect(longer, QDeadlineTimer(5000)),
+              SharedMemoryClient::Connection::Connected);
     m_channel.Close();
 
-    const QString longer = kName + u'x';
-    EXPECT_TRUE(SharedMemory::SocketPath(longer).isEmpty());
-    EXPECT_FALSE(m_channel.Listen(longer));
+    useFolder(100);
+    EXPECT_TRUE(SharedMemory::SocketPath(name).isEmpty());
+    EXPECT_FALSE(m_channel.Listen(name));
 }
 
 // Only root can become another user; the runtime folder is opened to others for the occasion
