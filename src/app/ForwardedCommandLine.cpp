@@ -65,13 +65,15 @@ void RunForwardedCommandLine(const QString& text, IStartActions& actions) {
 
 QStringList MakeFileArgumentsAbsolute(const QStringList& arguments) {
     QStringList result = arguments;
+    // The parser itself tells which parameter it will take for a file.
+    CNavigatorCmdLineInfo parsed;
     for (qsizetype i = 1; i < result.size(); ++i) {
         const QString& argument = result.at(i);
-        if (argument.isEmpty() || IsSwitchToken(argument) || QFileInfo(argument).isAbsolute())
-            continue;
-        const QFileInfo file(QDir::current(), argument);
-        if (file.exists())
-            result[i] = file.absoluteFilePath();
+        const bool isFlag = IsSwitchToken(argument);
+        const bool isFile = !isFlag && parsed.ExpectsFile();
+        parsed.ParseParam(isFlag ? argument.mid(1) : argument, isFlag, false);
+        if (isFile && !argument.isEmpty() && QFileInfo(argument).isRelative())
+            result[i] = QDir::current().absoluteFilePath(argument);
     }
     return result;
 }

@@ -20,7 +20,7 @@ QString JoinForwardedCommandLine(const QStringList& arguments);
 // Parses a handed-over text with a fresh command-line info and runs its start actions at once.
 void RunForwardedCommandLine(const QString& text, IStartActions& actions);
 
-// The arguments (the program first) with every plain argument that names an existing file
-// relative to the current folder made absolute, so that the running navigator, which has a
-// folder of its own, finds the same file.
+// The arguments (the program first) with every file argument made absolute against the current
+// folder, whether or not the file exists: the running navigator has a folder of its own, and a
+// relative path would name another file there.
 QStringList MakeFileArgumentsAbsolute(const QStringList& arguments);

@@ -89,15 +89,19 @@ TEST(ForwardedCommandLineTest, JoinedArgumentsSplitBackUnchanged) {
 
 class FileArgumentsTest : public AmbrelTest {};
 
-TEST_F(FileArgumentsTest, RelativeFileArgumentsAreMadeAbsoluteForTheRunningNavigator) {
+TEST_F(FileArgumentsTest, FileArgumentsAreMadeAbsoluteAgainstThisStartsFolder) {
+    // The running navigator has a folder of its own, where a file of the same name may lie:
+    // a file that does not exist here must not name that one.
     const QString file = WriteFile(u"work/my note.txt"_s, "text");
     const QString saved = QDir::currentPath();
     ASSERT_TRUE(QDir::setCurrent(Home() + u"/work"_s));
     const QStringList made = MakeFileArgumentsAbsolute(
-        {u"prog"_s, u"/NewNoteFromFile"_s, u"my note.txt"_s, u"/OpenMRUItem"_s, u"x"_s, u"/etc"_s});
+        {u"prog"_s, u"/NewNoteFromFile"_s, u"my note.txt"_s, u"/OpenMRUItem"_s, u"x"_s,
+         u"-viewdocument"_s, u"../gone.pdf"_s, u"y"_s, u"/NewNoteFromFile"_s, u"/etc/a.txt"_s});
     QDir::setCurrent(saved);
     EXPECT_EQ(made, (QStringList{u"prog"_s, u"/NewNoteFromFile"_s, file, u"/OpenMRUItem"_s, u"x"_s,
-                                 u"/etc"_s}));
+                                 u"-viewdocument"_s, Home() + u"/work/../gone.pdf"_s, u"y"_s,
+                                 u"/NewNoteFromFile"_s, u"/etc/a.txt"_s}));
 }
 
 } // namespace
