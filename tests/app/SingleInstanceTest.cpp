@@ -10,6 +10,9 @@
 #include <atomic>
 #include <future>
 
+#include <poll.h>
+#include <sys/wait.h>
+
 namespace {
 
 using namespace std::chrono_literals;
@@ -113,6 +116,47 @@ TEST_F(SingleInstanceTest, ACommandLineThatCannotTravelIsNotHandedOver) {
     // With no navigator running such a command line is simply this start's own.
     SingleInstance alone(u"AmbrelNavigator-other"_s);
     EXPECT_EQ(alone.Start({u"prog"_s, huge}), Outcome::Running);
+}
+
+// Only root can listen as another user: the socket is bound as root, then the listener drops
+// to another user, whose id the kernel records at listen().
+TEST_F(SingleInstanceTest, ASocketOfAnotherUserNeverGetsTheCommandLine) {
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "needs root to listen as another user";
+    const QByteArray path = QFile::encodeName(SocketPath());
+    int ready[2];
+    ASSERT_EQ(::pipe(ready), 0);
+    const pid_t child = ::fork();
+    if (child == 0) {
+        // Only plain system calls between fork and _exit.
+        const int fd = ::socket(AF_UNIX, SOCK_STREAM, 0);
+        sockaddr_un address{};
+        address.sun_family = AF_UNIX;
+        std::memcpy(address.sun_path, path.constData(), size_t(path.size()));
+        if (::bind(fd, reinterpret_cast<sockaddr*>(&address), sizeof address) != 0 ||
+            ::setresgid(65534, 65534, 65534) != 0 || ::setresuid(65534, 65534, 65534) != 0 ||
+            ::listen(fd, 4) != 0)
+            ::_exit(10);
+        [[maybe_unused]] const auto told = ::write(ready[1], "r", 1);
+        pollfd waiting{fd, POLLIN, 0};
+        if (::poll(&waiting, 1, 5000) != 1)
+            ::_exit(11);
+        pollfd peer{::accept(fd, nullptr, nullptr), POLLIN, 0};
+        char byte = 0;
+        ::_exit(::poll(&peer, 1, 3000) == 1 && ::read(peer.fd, &byte, 1) == 1 ? 13 : 0);
+    }
+    ASSERT_GT(child, 0);
+    ::close(ready[1]);
+    char byte = 0;
+    ASSERT_EQ(::read(ready[0], &byte, 1), 1) << "the other user's listener did not start";
+    ::close(ready[0]);
+
+    SingleInstance instance(kName);
+    EXPECT_EQ(instance.Start({u"prog"_s, u"/NewNote"_s}, 3s), Outcome::Unavailable);
+    int status = 0;
+    ASSERT_EQ(::waitpid(child, &status, 0), child);
+    ASSERT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 0) << "10: no listener, 11: no connection, 13: received";
 }
 
 } // namespace
