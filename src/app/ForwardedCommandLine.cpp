@@ -5,61 +5,9 @@
 #include <QDir>
 #include <QFileInfo>
 
-#include <algorithm>
-
-namespace {
-
-constexpr QChar kQuote = u'"';
-
-bool IsBlank(QChar c) {
-    return c.isSpace();
-}
-
-} // namespace
-
-QStringList SplitForwardedCommandLine(const QString& text) {
-    QStringList tokens;
-    qsizetype position = 0;
-    while (position < text.size()) {
-        const bool quotedStart = text[position] == kQuote;
-        bool quoting = false;
-        qsizetype end = position;
-        while (end < text.size() && (quoting || !IsBlank(text[end]))) {
-            if (text[end] == kQuote)
-                quoting = !quoting;
-            ++end;
-        }
-        QString token = text.mid(position, end - position);
-        if (quotedStart) {
-            token.remove(0, 1);
-            // The quote that closes the opening one goes too; later quotes stay.
-            const qsizetype closing = token.indexOf(kQuote);
-            if (closing >= 0)
-                token.remove(closing, 1);
-        }
-        tokens.append(token);
-        position = end + 1;
-    }
-    return tokens;
-}
-
-QString JoinForwardedCommandLine(const QStringList& arguments) {
-    QStringList parts;
-    parts.reserve(arguments.size());
-    for (const QString& argument : arguments) {
-        if (argument.contains(kQuote))
-            return {};
-        if (argument.isEmpty() || std::any_of(argument.begin(), argument.end(), IsBlank))
-            parts.append(kQuote + argument + kQuote);
-        else
-            parts.append(argument);
-    }
-    return parts.join(u' ');
-}
-
-void RunForwardedCommandLine(const QString& text, IStartActions& actions) {
+void RunForwardedCommandLine(const QStringList& arguments, IStartActions& actions) {
     CNavigatorCmdLineInfo info;
-    ParseCommandLine(info, SplitForwardedCommandLine(text));
+    ParseCommandLine(info, arguments);
     RunStartActions(info, actions);
 }
 
