@@ -113,13 +113,12 @@ bool CNavigatorApp::StartUp() {
     // A start from then on waits for this navigator to end instead of handing its command line
     // to one that is going away.
     connect(m_mainWindow, &WMainFrame::Closing, this, [this] { m_singleInstance->Withdraw(); });
-    m_singleInstance->Publish([this](const QString& commandLine) {
+    m_singleInstance->Publish([this] {
         if (m_mainWindow) {
             m_mainWindow->showNormal();
             m_mainWindow->raise();
             m_mainWindow->activateWindow();
         }
-        RunForwardedCommandLine(commandLine, m_startActions);
     });
 
     m_mainWindow->SetTrackPosition(true);
@@ -159,8 +158,10 @@ bool CNavigatorApp::OnIdle(int count) {
     m_mainWindow->OnIdleWork();
     NavigatorSettings::Instance()->SaveIfDirty();
     // The idle pass only runs once the queue is empty, so the window has been shown and
-    // painted before the start actions run; running them clears them.
+    // painted before the start actions run, this start's own before those handed over by later
+    // starts; running them clears them.
     RunStartActions(m_commandLineInfo, m_startActions);
+    m_singleInstance->RunHandedOver(m_startActions);
     return count < 1;
 }
 

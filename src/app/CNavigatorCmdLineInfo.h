@@ -22,6 +22,8 @@ public:
     bool OpenRecentItem() const { return m_openRecentItem; }
     bool ExpectsRecentItem() const { return m_expectsRecentItem; }
     bool HasAction() const { return m_hasAction; }
+    // The next plain parameter is the file of "NewNoteFromFile" or "ViewDocument".
+    bool ExpectsFile() const { return m_expectsFile; }
     const QString& FileArgument() const { return m_fileArgument; }
     const QString& RecentItem() const { return m_recentItem; }
 

@@ -53,10 +53,7 @@ SingleInstance::Outcome SingleInstance::Start(const QStringList& arguments,
         case SharedMemoryClient::Connection::Connected: {
             // The running navigator takes the lock to shut down; it must not wait for us.
             m_mutex.Release();
-            const QString text = JoinForwardedCommandLine(arguments);
-            if (text.isNull())
-                return Outcome::NotCarried;
-            switch (client.Exchange(text, deadline)) {
+            switch (client.Exchange(arguments, deadline)) {
             case SharedMemoryClient::Answer::Done:
                 return Outcome::HandedOver;
             case SharedMemoryClient::Answer::Refused:
@@ -90,8 +87,18 @@ SingleInstance::Outcome SingleInstance::Start(const QStringList& arguments,
     }
 }
 
-void SingleInstance::Publish(SharedMemory::Handler handler) {
-    m_channel.Publish(std::move(handler));
+void SingleInstance::Publish(std::function<void()> arrived) {
+    m_channel.Publish([this, arrived = std::move(arrived)](const QStringList& arguments) {
+        m_handedOver.append(arguments);
+        if (arrived)
+            arrived();
+    });
+}
+
+void SingleInstance::RunHandedOver(IStartActions& actions) {
+    // Taken off first: an action may let more come in while it runs.
+    while (!m_handedOver.isEmpty())
+        RunForwardedCommandLine(m_handedOver.takeFirst(), actions);
 }
 
 void SingleInstance::EndStartup() {
@@ -110,8 +117,8 @@ QString SingleInstance::Describe(Outcome outcome) {
     case Outcome::HandedOver:
         break;
     case Outcome::NotCarried:
-        return QStringLiteral("The running navigator did not take the command line (an argument "
-                              "holds a double quote, or the command line is too long).");
+        return QStringLiteral("The running navigator did not take the command line (it is too "
+                              "long).");
     case Outcome::NoAnswer:
         return QStringLiteral("A navigator is running but did not answer within %1 seconds.")
             .arg(kPatience.count() / 1000);

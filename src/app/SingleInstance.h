@@ -3,20 +3,25 @@
 #include "platform/SharedMemory.h"
 #include "platform/StartupMutex.h"
 
+#include <QList>
 #include <QString>
 #include <QStringList>
 
 #include <chrono>
+#include <functional>
+
+class IStartActions;
 
 // One navigator per user and desktop. A start takes the start-up lock and either becomes the
 // running navigator (it listens on the instance socket and keeps the lock until its start-up is
 // over) or hands its command line to the navigator already running and waits until that one
-// has run the start actions.
+// has taken it in. The running navigator keeps the handed-over command lines until its idle
+// pass runs their start actions, so that an action waiting for the user holds up no start.
 class SingleInstance final {
 public:
     enum class Outcome {
         Running,     // this process is the navigator now
-        HandedOver,  // the running navigator has run this command line
+        HandedOver,  // the running navigator has queued this command line
         NotCarried,  // the command line cannot be sent, or the running navigator refused it
         NoAnswer,    // a navigator holds the lock or the socket but did not answer in time
         Unavailable, // no private runtime folder, or the socket cannot be used
@@ -41,9 +46,12 @@ public:
     // most `patience` (a navigator that shuts down meanwhile is waited for within it).
     Outcome Start(const QStringList& arguments, std::chrono::milliseconds patience = kPatience);
 
-    // The running navigator starts answering: every handed-over command line goes to the
-    // handler, and its sender is answered once the handler returned.
-    void Publish(SharedMemory::Handler handler);
+    // The running navigator starts answering: every handed-over command line is queued, its
+    // sender answered, and `arrived` called (to bring the window to the front).
+    void Publish(std::function<void()> arrived);
+
+    // Runs the start actions of the queued command lines, in the order they came, each once.
+    void RunHandedOver(IStartActions& actions);
 
     // Start-up is over: later starts may take the lock.
     void EndStartup();
@@ -64,4 +72,5 @@ private:
     QString m_name;
     StartupMutex m_mutex;
     SharedMemory m_channel;
+    QList<QStringList> m_handedOver;
 };

@@ -4,6 +4,9 @@
 #include <QDir>
 #include <QFileInfo>
 #include <QStandardPaths>
+#include <QSysInfo>
+
+#include <utility>
 
 #include <sys/stat.h>
 #include <unistd.h>
@@ -38,12 +41,22 @@ QString RuntimeFolder() {
     if (!runtime.isEmpty() && IsPrivateFolder(runtime))
         return QDir::cleanPath(runtime);
 
-    const QString fallback =
-        QDir::tempPath() + QStringLiteral("/ambrel-runtime-") + QString::number(::geteuid());
-    const QByteArray encoded = QFile::encodeName(fallback);
-    if (::mkdir(encoded.constData(), 0700) != 0 && errno != EEXIST)
-        return {};
-    return IsPrivateFolder(fallback) ? fallback : QString();
+    // Anyone can make the first one before us, so it may well be refused; the cache folder is
+    // ours. A home shared between machines gets one folder per machine there: sockets are local.
+    const std::pair<QString, QString> candidates[] = {
+        {QDir::tempPath(), QStringLiteral("ambrel-runtime-") + QString::number(::geteuid())},
+        {QStandardPaths::writableLocation(QStandardPaths::GenericCacheLocation),
+         QStringLiteral("ambrel-runtime-") + QSysInfo::machineHostName()},
+    };
+    for (const auto& [parent, name] : candidates) {
+        if (!QFileInfo(parent).isAbsolute() || !QDir().mkpath(parent))
+            continue;
+        const QString folder = QDir::cleanPath(parent) + u'/' + name;
+        ::mkdir(QFile::encodeName(folder).constData(), 0700);
+        if (IsPrivateFolder(folder))
+            return folder;
+    }
+    return {};
 }
 
 } // namespace Platform

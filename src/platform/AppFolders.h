@@ -12,8 +12,9 @@ QString ApplicationDataFolder();
 QString ProgramFolder();
 
 // The per-user folder for the start-up lock and the running-instance socket: $XDG_RUNTIME_DIR
-// when it is a private folder of ours, else a 0700 folder under the temporary folder. Made on
-// first use. Empty when no safe folder can be had (a link, someone else's, open to others).
+// when it is a private folder of ours, else a 0700 folder under the temporary folder, else one
+// in the user's cache folder ($XDG_CACHE_HOME, default ~/.cache). Made on first use. Empty when
+// no safe folder can be had (each a link, someone else's, or open to others).
 QString RuntimeFolder();
 
 } // namespace Platform

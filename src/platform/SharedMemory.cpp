@@ -2,14 +2,14 @@
 
 #include "platform/AppFolders.h"
 
+#include <QCryptographicHash>
 #include <QFile>
+#include <QJsonArray>
+#include <QJsonDocument>
 #include <QLocalServer>
 #include <QLocalSocket>
-#include <QStringDecoder>
 #include <QTimer>
 #include <QtEndian>
-
-#include <optional>
 
 #include <sys/socket.h>
 #include <unistd.h>
@@ -18,14 +18,6 @@ namespace {
 
 // sockaddr_un holds 108 bytes with the terminating NUL; stay one below that.
 constexpr qsizetype kMaximumSocketPathBytes = 106;
-
-std::optional<QString> DecodeMessage(const QByteArray& bytes) {
-    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
-    QString text = decoder.decode(bytes);
-    if (decoder.hasError() || text.contains(QChar(0)))
-        return std::nullopt;
-    return text;
-}
 
 // Whether the sender has closed its end, after giving up waiting for the answer.
 bool PeerHungUp(QLocalSocket* socket) {
@@ -50,9 +42,15 @@ QString SharedMemory::SocketPath(const QString& name) {
     if (folder.isEmpty())
         return {};
     const QString path = folder + u'/' + name;
-    if (QFile::encodeName(path).size() > kMaximumSocketPathBytes)
+    if (QFile::encodeName(path).size() <= kMaximumSocketPathBytes)
+        return path;
+    // A deep runtime folder leaves too little room: a digest of the name stands in for it.
+    const QByteArray digest =
+        QCryptographicHash::hash(name.toUtf8(), QCryptographicHash::Sha256).toHex().left(16);
+    const QString shortened = folder + QStringLiteral("/Ambrel-") + QString::fromLatin1(digest);
+    if (QFile::encodeName(shortened).size() > kMaximumSocketPathBytes)
         return {};
-    return path;
+    return shortened;
 }
 
 bool SharedMemory::PeerIsSameUser(qintptr socketDescriptor) {
@@ -61,6 +59,25 @@ bool SharedMemory::PeerIsSameUser(qintptr socketDescriptor) {
     if (::getsockopt(int(socketDescriptor), SOL_SOCKET, SO_PEERCRED, &credentials, &length) != 0)
         return false;
     return credentials.uid == ::geteuid();
+}
+
+QByteArray SharedMemory::EncodeArguments(const QStringList& arguments) {
+    return QJsonDocument(QJsonArray::fromStringList(arguments)).toJson(QJsonDocument::Compact);
+}
+
+std::optional<QStringList> SharedMemory::DecodeArguments(const QByteArray& body) {
+    // The reader refuses broken UTF-8 and anything after the array.
+    QJsonParseError error{};
+    const QJsonDocument document = QJsonDocument::fromJson(body, &error);
+    if (error.error != QJsonParseError::NoError || !document.isArray())
+        return std::nullopt;
+    QStringList arguments;
+    for (const QJsonValue& value : document.array()) {
+        if (!value.isString() || value.toString().contains(QChar(0)))
+            return std::nullopt;
+        arguments.append(value.toString());
+    }
+    return arguments;
 }
 
 bool SharedMemory::Listen(const QString& name) {
@@ -153,14 +170,14 @@ void SharedMemory::Watch(QLocalSocket* socket) {
             return;
         disconnect(*reading);
         patience->stop();
-        std::optional<QString> text;
+        std::optional<QStringList> arguments;
         if (buffer->size() == 4 + qsizetype(length))
-            text = DecodeMessage(buffer->mid(4));
-        if (!text) {
+            arguments = DecodeArguments(buffer->mid(4));
+        if (!arguments) {
             Answer(socket, kAnswerRefused);
             return;
         }
-        m_received.append({socket, *text});
+        m_received.append({socket, *arguments});
         HandleReceived();
     };
     *reading = connect(socket, &QLocalSocket::readyRead, this, read);
@@ -179,7 +196,7 @@ void SharedMemory::HandleReceived() {
         if (PeerHungUp(next.socket))
             continue;
         if (m_handler)
-            m_handler(next.text);
+            m_handler(next.arguments);
         if (next.socket && next.socket->state() == QLocalSocket::ConnectedState)
             Answer(next.socket, kAnswerDone);
     }

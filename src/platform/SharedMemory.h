@@ -4,9 +4,11 @@
 #include <QObject>
 #include <QPointer>
 #include <QString>
+#include <QStringList>
 
 #include <functional>
 #include <memory>
+#include <optional>
 
 class QLocalServer;
 class QLocalSocket;
@@ -14,15 +16,18 @@ class QLocalSocket;
 // The running navigator's announcement: a local socket named after the instance name in the
 // per-user runtime folder. A later start connects to it and hands over its command line.
 //
-// On the wire a message is a 4-byte big-endian length and that many bytes of UTF-8 text; the
-// answer is one byte, sent after the handler has returned. Connections of other users, texts
-// over the size limit, text that is not valid UTF-8 or holds a NUL, extra bytes and peers that
-// stall are dropped without ever waiting on them. A message whose sender stopped waiting before
-// its turn came is not handled: that start has already reported that nothing happened.
+// On the wire a message is a 4-byte big-endian length and that many bytes of UTF-8 text: a JSON
+// array of strings, the arguments with the program first, so that every argument arrives as it
+// was given. The answer is one byte, sent after the handler has returned; the handler only takes
+// the arguments in, so the answer does not wait for what they ask for. Connections of other
+// users, messages over the size limit, anything but valid UTF-8 holding such an array without
+// NULs, extra bytes and peers that stall are dropped without ever waiting on them. A message
+// whose sender stopped waiting before its turn came is not handled: that start has already
+// reported that nothing happened.
 class SharedMemory final : public QObject {
     Q_OBJECT
 public:
-    using Handler = std::function<void(const QString& text)>;
+    using Handler = std::function<void(const QStringList& arguments)>;
 
     static constexpr qsizetype kMaximumMessageBytes = 64 * 1024;
     static constexpr char kAnswerDone = 'A';
@@ -33,12 +38,18 @@ public:
     explicit SharedMemory(QObject* parent = nullptr);
     ~SharedMemory() override;
 
-    // The socket path for an instance name; empty when there is no safe runtime folder, the
-    // name is not a plain file name or the path is too long for a local socket.
+    // The socket path for an instance name; a name that would make the path too long for a
+    // local socket is replaced by a digest of it. Empty when there is no safe runtime folder, the
+    // name is not a plain file name or even the digest leaves the path too long.
     static QString SocketPath(const QString& name);
 
     // Whether the peer on a connected local socket runs as the same user as this process.
     static bool PeerIsSameUser(qintptr socketDescriptor);
+
+    // The message body for an argument list, and the list back from a body; nothing for a body
+    // that is not a well-formed message.
+    static QByteArray EncodeArguments(const QStringList& arguments);
+    static std::optional<QStringList> DecodeArguments(const QByteArray& body);
 
     // Starts listening. A socket file already at the path is taken for a dead navigator's and
     // replaced, so call this only while holding the start-up mutex and after no navigator
@@ -57,7 +68,7 @@ public:
 private:
     struct Received {
         QPointer<QLocalSocket> socket;
-        QString text;
+        QStringList arguments;
     };
 
     void AcceptPending();

@@ -50,11 +50,11 @@ SharedMemoryClient::Connection SharedMemoryClient::Connect(const QString& name,
     return Connection::Connected;
 }
 
-SharedMemoryClient::Answer SharedMemoryClient::Exchange(const QString& text,
+SharedMemoryClient::Answer SharedMemoryClient::Exchange(const QStringList& arguments,
                                                         QDeadlineTimer deadline) {
     if (!m_socket)
         return Answer::Dropped;
-    const QByteArray bytes = text.toUtf8();
+    const QByteArray bytes = SharedMemory::EncodeArguments(arguments);
     if (bytes.size() > SharedMemory::kMaximumMessageBytes)
         return Answer::TooLarge;
 

@@ -2,6 +2,7 @@
 
 #include <QDeadlineTimer>
 #include <QString>
+#include <QStringList>
 
 #include <memory>
 
@@ -18,9 +19,9 @@ public:
         Unavailable, // no usable path, or a peer of another user
     };
     enum class Answer {
-        Done,     // the running navigator handled the text
+        Done,     // the running navigator took the arguments in
         Refused,  // it took the message for malformed
-        TooLarge, // the text is over the size limit and was not sent
+        TooLarge, // the message is over the size limit and was not sent
         Dropped,  // the connection closed without an answer
         NoAnswer, // the deadline passed first
     };
@@ -29,8 +30,9 @@ public:
     ~SharedMemoryClient();
 
     Connection Connect(const QString& name, QDeadlineTimer deadline);
-    // Sends the text and waits for the answer; only after Connect answered Connected.
-    Answer Exchange(const QString& text, QDeadlineTimer deadline);
+    // Sends the arguments (the program first) and waits for the answer; only after Connect
+    // answered Connected.
+    Answer Exchange(const QStringList& arguments, QDeadlineTimer deadline);
 
 private:
     std::unique_ptr<QLocalSocket> m_socket;

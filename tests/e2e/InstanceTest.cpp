@@ -65,16 +65,37 @@ TEST_F(InstanceTest, NewNoteFromFileMakesTheNoteAndRemovesTheFile) {
     EXPECT_TRUE(CatalogText().contains(QStringLiteral("<type>note</type>")));
 }
 
-TEST_F(InstanceTest, ASecondStartHandsItsNoteToTheRunningNavigatorBeforeItEnds) {
+TEST_F(InstanceTest, ASecondStartHandsItsNoteToTheRunningNavigator) {
     NavigatorProcess navigator(Home());
     navigator.Start();
     ASSERT_TRUE(navigator.WaitUntilRunning());
     const int before = ItemFolderCount();
 
     EXPECT_EQ(navigator.RunToEnd({QStringLiteral("-newnote")}), 0);
-    EXPECT_EQ(ItemFolderCount(), before + 1) << "the note was not made before the start ended";
+    EXPECT_TRUE(WaitFor([&] { return ItemFolderCount() == before + 1; }));
     EXPECT_EQ(navigator.Process().state(), QProcess::Running);
     ASSERT_TRUE(navigator.Terminate());
+}
+
+// A start is answered once its command line is queued: an earlier start's action that waits for
+// the user does not make it fail.
+TEST_F(InstanceTest, StartsAreAnsweredWhileAnEarlierStartsActionWaitsForTheUser) {
+    NavigatorProcess navigator(Home());
+    navigator.Start();
+    ASSERT_TRUE(navigator.WaitUntilRunning());
+    // No note can be made from a text file that is not there: a message says so and waits.
+    const QStringList startsInARow[] = {
+        {QStringLiteral("/NewNoteFromFile"), Home() + QStringLiteral("/missing.txt")},
+        {QStringLiteral("/NewNote")},
+        {QStringLiteral("/NewNote")},
+    };
+    for (const QStringList& arguments : startsInARow)
+        EXPECT_EQ(navigator.RunToEnd(arguments, 8000), 0) << arguments.join(u' ').toStdString();
+    // Only the item of the note that waits for the message is there: the later notes wait
+    // their turn behind it.
+    QThread::msleep(500);
+    EXPECT_EQ(ItemFolderCount(), 1);
+    EXPECT_EQ(navigator.Process().state(), QProcess::Running);
 }
 
 TEST_F(InstanceTest, StartsAtTheSameMomentGiveOneNavigator) {

@@ -20,34 +20,42 @@ protected:
     void ListenAndPublish() {
         ASSERT_TRUE(m_channel.Listen(kName));
         ASSERT_EQ(m_channel.ServerPath(), Path());
-        m_channel.Publish([this](const QString& text) { m_handled.append(text); });
+        m_channel.Publish([this](const QStringList& arguments) { m_handled.append(arguments); });
     }
 
     SharedMemory m_channel;
-    QStringList m_handled;
+    QList<QStringList> m_handled;
 };
 
-TEST_F(SharedMemoryTest, WellFormedTextIsHandledAndAnsweredAndTheRestRefused) {
+TEST_F(SharedMemoryTest, AnArgumentListIsTakenInAndAnsweredAndEverythingElseRefused) {
     ListenAndPublish();
-    const QByteArray largest(SharedMemory::kMaximumMessageBytes, 'a');
+    const QStringList arguments{QStringLiteral("prog"), QStringLiteral("/ViewDocument"),
+                                QStringLiteral("/home/me/\"\u00fc\" \\ b\n.pdf"), QString()};
+    const QByteArray largest =
+        "[\"" + QByteArray(SharedMemory::kMaximumMessageBytes - 4, 'a') + "\"]";
     const struct {
         QByteArray bytes;
         const char* answer;
     } cases[] = {
-        {QByteArray("\x00\x00\x00\x10prog /NewNote \xc3\xbc", 20), "A"},
-        {Frame(QByteArray()), "A"},
+        {Frame(SharedMemory::EncodeArguments(arguments)), "A"},
+        {Frame("[]"), "A"},
         {Frame(largest), "A"},
         {QByteArray("\x00\x01\x00\x01", 4), "R"}, // over 64 KiB announced
         {QByteArray("\xff\xff\xff\xff", 4), "R"},
-        {Frame("prog /ViewDocument \xff\xfe"), "R"}, // not UTF-8
-        {Frame(QByteArray("prog\0/NewNote", 13)), "R"},
-        {Frame("prog /NewNote") + "x", "R"}, // bytes after the message
+        {Frame(QByteArray()), "R"},
+        {Frame("prog /NewNote"), "R"},
+        {Frame("{\"prog\": \"/NewNote\"}"), "R"},
+        {Frame("[\"prog\", 1]"), "R"},
+        {Frame("[\"prog\", \"/ViewDocument \xff\xfe\"]"), "R"}, // not UTF-8
+        {Frame("[\"prog\\u0000\", \"/NewNote\"]"), "R"},
+        {Frame("[\"prog\"]") + "x", "R"}, // bytes after the message
     };
     for (const auto& c : cases)
         EXPECT_EQ(SendRaw(Path(), c.bytes), QByteArray(c.answer))
             << c.bytes.left(20).toHex().constData();
-    EXPECT_EQ(m_handled, (QStringList{QStringLiteral("prog /NewNote \u00fc"), QString(),
-                                      QString::fromLatin1(largest)}));
+    EXPECT_EQ(m_handled,
+              (QList<QStringList>{
+                  arguments, {}, {QString(SharedMemory::kMaximumMessageBytes - 4, u'a')}}));
 }
 
 TEST_F(SharedMemoryTest, AStalledSenderDoesNotHoldUpTheNext) {
@@ -55,11 +63,12 @@ TEST_F(SharedMemoryTest, AStalledSenderDoesNotHoldUpTheNext) {
     QLocalSocket stalled;
     stalled.connectToServer(Path());
     ASSERT_TRUE(stalled.waitForConnected(5000));
-    stalled.write(QByteArray("\x00\x00\x00\x40prog", 8));
+    stalled.write(QByteArray("\x00\x00\x00\x40[\"prog", 10));
     ASSERT_TRUE(stalled.waitForBytesWritten(5000));
 
-    EXPECT_EQ(SendRaw(Path(), Frame("prog /OpenDocument")), QByteArray("A"));
-    EXPECT_EQ(m_handled, QStringList{QStringLiteral("prog /OpenDocument")});
+    EXPECT_EQ(SendRaw(Path(), Frame("[\"prog\",\"/OpenDocument\"]")), QByteArray("A"));
+    EXPECT_EQ(m_handled,
+              (QList<QStringList>{{QStringLiteral("prog"), QStringLiteral("/OpenDocument")}}));
     EXPECT_EQ(stalled.state(), QLocalSocket::ConnectedState);
 }
 
@@ -69,27 +78,40 @@ TEST_F(SharedMemoryTest, ADeadNavigatorsSocketIsReplacedAndClosingRemovesOurs) {
     EXPECT_EQ(client.Connect(kName, QDeadlineTimer(5000)),
               SharedMemoryClient::Connection::NoListener);
     ListenAndPublish();
-    EXPECT_EQ(SendRaw(Path(), Frame("prog")), QByteArray("A"));
+    EXPECT_EQ(SendRaw(Path(), Frame("[\"prog\"]")), QByteArray("A"));
     m_channel.Close();
     EXPECT_FALSE(QFile::exists(Path()));
 }
 
-TEST_F(SharedMemoryTest, SocketPathsTooLongForTheSystemAreRefused) {
+TEST_F(SharedMemoryTest, ANameTooLongForASocketPathIsShortenedAndATooDeepFolderRefused) {
     // sockaddr_un takes 107 bytes and the terminating NUL; the longest path used is 106.
     const QString base = Home() + QStringLiteral("/r");
-    const qsizetype room = 106 - (base.size() + 1 + kName.size());
-    ASSERT_GT(room, 0);
-    const QString folder = base + QString(room, u'x');
-    ASSERT_TRUE(QDir().mkpath(folder));
-    QFile::setPermissions(folder, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
-    qputenv("XDG_RUNTIME_DIR", QFile::encodeName(folder));
-    EXPECT_EQ(SharedMemory::SocketPath(kName).size(), 106);
-    EXPECT_TRUE(m_channel.Listen(kName));
+    const auto useFolder = [&](qsizetype size) {
+        const QString folder = base + QString(size - base.size(), u'x');
+        QDir().mkpath(folder);
+        QFile::setPermissions(folder, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+        qputenv("XDG_RUNTIME_DIR", QFile::encodeName(folder));
+        return folder;
+    };
+    const QString name = QStringLiteral("AmbrelNavigator-1.0.0.521-:0-me");
+    const QString folder = useFolder(106 - 1 - name.size());
+    EXPECT_EQ(SharedMemory::SocketPath(name), folder + u'/' + name);
+
+    // One byte more and the name goes into the path as a short digest, one per name.
+    const QString longer = name + u'x';
+    const QString shortened = SharedMemory::SocketPath(longer);
+    EXPECT_TRUE(shortened.startsWith(folder + u'/')) << shortened.toStdString();
+    EXPECT_LE(shortened.size(), 106);
+    EXPECT_NE(shortened, SharedMemory::SocketPath(name + u'y'));
+    ASSERT_TRUE(m_channel.Listen(longer));
+    SharedMemoryClient client;
+    EXPECT_EQ(client.Connect(longer, QDeadlineTimer(5000)),
+              SharedMemoryClient::Connection::Connected);
     m_channel.Close();
 
-    const QString longer = kName + u'x';
-    EXPECT_TRUE(SharedMemory::SocketPath(longer).isEmpty());
-    EXPECT_FALSE(m_channel.Listen(longer));
+    useFolder(100);
+    EXPECT_TRUE(SharedMemory::SocketPath(name).isEmpty());
+    EXPECT_FALSE(m_channel.Listen(name));
 }
 
 // Only root can become another user; the runtime folder is opened to others for the occasion
@@ -103,7 +125,7 @@ TEST_F(SharedMemoryTest, ConnectionsOfAnotherUserAreRefused) {
     QFile::setPermissions(Path(), QFile::Permissions(0x6066));     // rw-rw-rw-
 
     const QByteArray path = QFile::encodeName(Path());
-    const QByteArray message = Frame("prog /NewNote");
+    const QByteArray message = Frame("[\"prog\",\"/NewNote\"]");
     const pid_t child = ::fork();
     if (child == 0) {
         // Only plain system calls between fork and _exit.
