@@ -30,10 +30,14 @@ public:
     // Valid during a rebuild only: between idle passes the model may free records, so the
     // handlers look records up by key.
     NavListItemData* record = nullptr;
+    // The record the node was last found by; only compared, never followed.
+    const NavListItemData* recordKey = nullptr;
     NavTreeNode* wantedParent = nullptr;
     std::vector<NavTreeNode*> wanted;
+    QString title;
     int image = -1;
-    bool seen = false;
+    // The rebuild in which the node was last shown.
+    quint64 seenIn = 0;
 };
 
 // Hands the finished in-place edit to the tree instead of writing the item: the title
@@ -79,6 +83,10 @@ WNavigatorTree::~WNavigatorTree() {
     m_followingModel = true; // the items go with the control; nothing reaches the model
 }
 
+void WNavigatorTree::SetCommandRouter(CCommandRouter* router) {
+    m_router = router;
+}
+
 // ---- Rebuild ----------------------------------------------------------------------------
 
 void WNavigatorTree::OnIdle() {
@@ -100,10 +108,7 @@ void WNavigatorTree::Rebuild() {
     QTreeWidgetItem* before = currentItem();
     m_followingModel = true;
 
-    for (NavTreeNode* node : std::as_const(m_nodes)) {
-        node->seen = false;
-        node->wanted.clear();
-    }
+    ++m_generation;
     m_wantedTopLevel.clear();
     m_shown.clear();
 
@@ -113,22 +118,12 @@ void WNavigatorTree::Rebuild() {
     while (NavListItemData* record = model->ForEachVisible(position))
         ShowRecord(record);
 
-    // Items whose parent changed leave it first, so that dropping the items of records no
-    // longer shown cannot take them along.
-    for (NavTreeNode* node : m_shown) {
-        QTreeWidgetItem* parent = node->parent();
-        const bool attached = parent != nullptr || node->treeWidget() == this;
-        if (attached && parent == node->wantedParent)
-            continue;
-        if (parent != nullptr)
-            parent->takeChild(parent->indexOfChild(node));
-        else if (attached)
-            takeTopLevelItem(indexOfTopLevelItem(node));
-    }
     QStringList gone;
-    for (auto node = m_nodes.cbegin(); node != m_nodes.cend(); ++node) {
-        if (!node.value()->seen)
-            gone.append(node.key());
+    if (m_shown.size() != static_cast<std::size_t>(m_nodes.size())) {
+        for (auto node = m_nodes.cbegin(); node != m_nodes.cend(); ++node) {
+            if (node.value()->seenIn != m_generation)
+                gone.append(node.key());
+        }
     }
     for (const QString& key : std::as_const(gone)) {
         if (NavTreeNode* node = m_nodes.value(key))
@@ -144,8 +139,10 @@ void WNavigatorTree::Rebuild() {
     PlaceChildren(nullptr, m_wantedTopLevel);
 
     // Expansion is the view's state and can be set only once the items are in the control.
-    for (NavTreeNode* node : m_shown)
-        SyncExpansion(node, node->record);
+    for (NavTreeNode* node : m_shown) {
+        if (node->record->GetKind() == ItemKindFolder)
+            SyncExpansion(node, node->record);
+    }
 
     NavListItemData* selected = model->GetSelected();
     QTreeWidgetItem* current = selected != nullptr ? m_nodes.value(selected->GetItemId()) : nullptr;
@@ -160,22 +157,55 @@ void WNavigatorTree::Rebuild() {
     m_followingModel = false;
 }
 
+namespace {
+
+// Texts that share their data (the usual case: the node took it from the record) are equal
+// without comparing them.
+bool SameText(const QString& a, const QString& b) {
+    return a.constData() == b.constData() || a == b;
+}
+
+} // namespace
+
 NavTreeNode* WNavigatorTree::ShowRecord(NavListItemData* record) {
     const QString& key = record->GetItemId();
-    NavTreeNode* node = m_nodes.value(key);
-    if (node != nullptr && node->seen)
+    NavTreeNode* node = m_byRecord.value(record);
+    if (node != nullptr && !SameText(node->key, key))
+        node = nullptr; // a new record where a freed one was
+    if (node != nullptr && node->seenIn == m_generation)
         return node;
     NavTreeNode* parent =
         record->GetParent() != nullptr ? ShowRecord(record->GetParent()) : nullptr;
     if (node == nullptr) {
-        node = new NavTreeNode(key);
-        m_nodes.insert(key, node);
+        node = m_nodes.value(key);
+        if (node == nullptr) {
+            node = new NavTreeNode(key);
+            m_nodes.insert(key, node);
+        }
+    }
+    if (node->recordKey != record) {
+        if (m_byRecord.value(node->recordKey) == node)
+            m_byRecord.remove(node->recordKey);
+        node->recordKey = record;
+        m_byRecord.insert(record, node);
     }
     node->record = record;
-    node->seen = true;
+    node->seenIn = m_generation;
+    node->wanted.clear();
     node->wantedParent = parent;
     (parent != nullptr ? parent->wanted : m_wantedTopLevel).push_back(node);
     m_shown.push_back(node);
+
+    // An item whose parent changed leaves it now, so that dropping the items of records no
+    // longer shown cannot take it along.
+    QTreeWidgetItem* current = node->parent();
+    const bool attached = current != nullptr || node->treeWidget() == this;
+    if (attached && current != parent) {
+        if (current != nullptr)
+            current->takeChild(current->indexOfChild(node));
+        else
+            takeTopLevelItem(indexOfTopLevelItem(node));
+    }
 
     const int image = WNavDS::Instance()->ImageIndexOf(record);
     if (image != node->image) {
@@ -184,8 +214,10 @@ NavTreeNode* WNavigatorTree::ShowRecord(NavListItemData* record) {
                              ? m_images[static_cast<std::size_t>(image)]
                              : QIcon());
     }
-    if (node->text(0) != record->GetTitle())
-        node->setText(0, record->GetTitle());
+    if (!SameText(node->title, record->GetTitle())) {
+        node->title = record->GetTitle();
+        node->setText(0, node->title);
+    }
     return node;
 }
 
@@ -215,8 +247,12 @@ void WNavigatorTree::DropNode(NavTreeNode* node) {
     QList<QTreeWidgetItem*> pending{node};
     while (!pending.isEmpty()) {
         QTreeWidgetItem* item = pending.takeLast();
-        if (auto* below = NodeOf(item); below != nullptr && m_nodes.value(below->key) == below)
-            m_nodes.remove(below->key);
+        if (NavTreeNode* below = NodeOf(item)) {
+            if (m_nodes.value(below->key) == below)
+                m_nodes.remove(below->key);
+            if (m_byRecord.value(below->recordKey) == below)
+                m_byRecord.remove(below->recordKey);
+        }
         for (int index = 0; index < item->childCount(); ++index)
             pending.append(item->child(index));
     }

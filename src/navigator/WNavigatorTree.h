@@ -45,7 +45,7 @@ public:
     ~WNavigatorTree() override;
 
     // The context menus take their entries from the router, so that they run through it.
-    void SetCommandRouter(CCommandRouter* router) { m_router = router; }
+    void SetCommandRouter(CCommandRouter* router);
 
     // The tree's share of the idle pass: rebuilds when the model changed, then opens the
     // selection's name for editing when a new folder asks for it. Waits while an internal drag
@@ -126,6 +126,9 @@ private:
     qint64 Now() const;
 
     QHash<QString, NavTreeNode*> m_nodes;
+    // The same nodes by the record they showed last, the quick way in during a rebuild.
+    QHash<const NavListItemData*, NavTreeNode*> m_byRecord;
+    quint64 m_generation = 0;
     // During a rebuild: the wanted top-level items, and every shown node, parents first.
     std::vector<NavTreeNode*> m_wantedTopLevel;
     std::vector<NavTreeNode*> m_shown;
