@@ -16,9 +16,6 @@
 #include <QTemporaryDir>
 
 #include <sys/resource.h>
-#include <unistd.h>
-
-#include <cstdio>
 
 #include <memory>
 
@@ -41,18 +38,6 @@ void ReportPeakMemory(benchmark::State& state) {
     state.counters["maxrss_MB"] = static_cast<double>(usage.ru_maxrss) / 1024.0;
 }
 
-// The memory the process holds now, in megabytes.
-double ResidentMegabytes() {
-    long pages = 0;
-    long resident = 0;
-    if (std::FILE* statm = std::fopen("/proc/self/statm", "r")) {
-        if (std::fscanf(statm, "%ld %ld", &pages, &resident) != 2)
-            resident = 0;
-        std::fclose(statm);
-    }
-    return static_cast<double>(resident) * static_cast<double>(sysconf(_SC_PAGESIZE)) / 1048576.0;
-}
-
 std::unique_ptr<WNavigatorTree> ShownTree() {
     auto tree = std::make_unique<WNavigatorTree>();
     tree->resize(300, 600);
@@ -63,20 +48,13 @@ std::unique_ptr<WNavigatorTree> ShownTree() {
 // From an empty window to the whole tree painted.
 void BM_TreeFirstWindow(benchmark::State& state) {
     WNavDS* model = ModelFor(Bench::PrepareCatalog(static_cast<int>(state.range(0))));
-    bool first = true;
     for (auto _ : state) {
-        const double before = ResidentMegabytes();
         std::unique_ptr<WNavigatorTree> tree = ShownTree();
         model->SetChanged(true);
         tree->OnIdle();
         tree->repaint();
         QApplication::processEvents();
         state.PauseTiming();
-        // What the tree itself holds, beside the catalog and the model (later rounds reuse
-        // the memory the first one freed).
-        if (first)
-            state.counters["tree_MB"] = ResidentMegabytes() - before;
-        first = false;
         tree.reset();
         state.ResumeTiming();
     }
