@@ -250,10 +250,13 @@ HRESULT CNavigatorApp::CreateItem(DataExchange::IProperties* properties,
         return E_FAIL;
     WNavDS* navigator = WNavDS::Instance();
     if (type.compare(QStringLiteral("note"), Qt::CaseInsensitive) == 0) {
+        // The catalog knows the kind only in its own spelling.
+        properties->SetProperty(QStringLiteral("type"), QStringLiteral("note"));
         navigator->NewNote(properties, itemIdSink);
         return S_OK;
     }
     if (type.compare(QStringLiteral("document"), Qt::CaseInsensitive) == 0) {
+        properties->SetProperty(QStringLiteral("type"), QStringLiteral("document"));
         const HRESULT result = navigator->AddNewItemAndLimit(properties, 0, itemIdSink);
         navigator->SetChanged(true);
         return result;

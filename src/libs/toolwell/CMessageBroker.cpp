@@ -113,8 +113,9 @@ void CMessageBroker::Disconnect() {
         m_connection.unregisterObject(m_objectPath);
         m_serviceName.clear();
     }
-    if (m_connection.isConnected())
-        QDBusConnection::disconnectFromBus(m_connectionName);
+    // The connection closes once nothing holds it any more.
+    m_connection = QDBusConnection(QString());
+    QDBusConnection::disconnectFromBus(m_connectionName);
 }
 
 void CMessageBroker::Post(const QString& name, QMap<QString, QString> properties) {
