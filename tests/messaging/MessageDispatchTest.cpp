@@ -87,6 +87,8 @@ protected:
         broker.reset(CMessageBroker::Connect());
         ASSERT_TRUE(broker);
         ASSERT_EQ(broker->RegisterService(u"AmbrelService"_s, &manager), S_OK);
+        // Listens once the name has its owner.
+        peer = std::make_unique<Peer>(u"peer"_s);
     }
     void TearDown() override {
         peer.reset();
@@ -109,7 +111,7 @@ protected:
     CNavigatorApp application{{u"ambrel-navigator"_s}};
     CNavInstanceMgr manager{&application};
     ReleasePtr<IMessageBroker> broker;
-    std::unique_ptr<Peer> peer = std::make_unique<Peer>(u"peer"_s);
+    std::unique_ptr<Peer> peer;
 };
 
 TEST_F(MessageDispatchTest, EachMessageActsOnlyWithWellFormedKeys) {
