@@ -9,7 +9,7 @@ packages=(
   qt6-svg-dev libqt6svg6
   libpugixml-dev
   googletest libgtest-dev libgmock-dev libbenchmark-dev
-  dbus-daemon dbus-bin xdg-utils
+  dbus-daemon dbus-bin xdg-utils desktop-file-utils
   fonts-dejavu-core
 )
 

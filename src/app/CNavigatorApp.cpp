@@ -2,8 +2,12 @@
 
 #include "app/ForwardedCommandLine.h"
 #include "app/IdlePass.h"
+#include "app/SystemIntegration.h"
+#include "dataexchange/IProperties.h"
 #include "libs/toolwell/IHarborUtils.h"
 #include "libs/toolwell/ISnapshotService.h"
+#include "messaging/ActivityCenter.h"
+#include "messaging/IWindowCallback.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 #include "ui/ModalDialog.h"
@@ -24,11 +28,22 @@ constexpr int kDefaultHeight = 650;
 QtMessageBox g_messageBox;
 QtWaitCursor g_waitCursor;
 
+CNavigatorApp* g_application = nullptr;
+
 } // namespace
 
-CNavigatorApp::CNavigatorApp(QStringList arguments) : m_arguments(std::move(arguments)) {}
+extern "C" __attribute__((visibility("default"))) INavigatorService*
+GetNavigatorServiceInterface() {
+    return g_application;
+}
+
+CNavigatorApp::CNavigatorApp(QStringList arguments) : m_arguments(std::move(arguments)) {
+    g_application = this;
+}
 
 CNavigatorApp::~CNavigatorApp() {
+    if (g_application == this)
+        g_application = nullptr;
     Platform::SetMessageBox(nullptr);
     Platform::SetWaitCursor(nullptr);
 }
@@ -124,10 +139,17 @@ bool CNavigatorApp::StartUp() {
     m_mainWindow->SetTrackPosition(true);
     settings->SetFrame(m_mainWindow);
 
+    ConnectMessageBroker();
+
     // The window options are applied through their settings, which also shows them at once.
     settings->SetKeepOnTop(settings->GetKeepOnTop());
     settings->SetShowMessageCentre(settings->GetShowMessageCentre());
     settings->SetShowFrame(settings->GetShowFrame());
+
+    QString programFolder;
+    UnicodeStringPtr programFolderSink(&programFolder);
+    m_applicationInfo->GetProgramFolder(&programFolderSink);
+    RegisterBrowserMenuEntry(programFolder);
 
     m_terminationSignals = std::make_unique<TerminationSignals>();
     connect(m_terminationSignals.get(), &TerminationSignals::Received, this, [this] {
@@ -157,6 +179,9 @@ bool CNavigatorApp::OnIdle(int count) {
     }
     m_mainWindow->OnIdleWork();
     NavigatorSettings::Instance()->SaveIfDirty();
+    m_instanceManager.ProcessQueue();
+    if (m_firstIdle)
+        RunFirstIdleWork();
     // The idle pass only runs once the queue is empty, so the window has been shown and
     // painted before the start actions run, this start's own before those handed over by later
     // starts; running them clears them.
@@ -172,11 +197,16 @@ int CNavigatorApp::ExitInstance() {
     if (m_singleInstance)
         m_singleInstance->Withdraw();
     m_terminationSignals.reset();
+    m_instanceManager.ProcessQueue();
     NavigatorSettings* settings = NavigatorSettings::Instance();
     if (settings->GetCleanDeletedOnClose())
         WNavDS::Instance()->EmptyDeletedItems();
     if (settings->IsDirty())
         settings->Save();
+    if (m_messageBroker) {
+        m_messageBroker->Disconnect();
+        m_messageBroker.reset();
+    }
     SetSnapshotNoteHandler({});
     WNavDS::DestroyInstance();
     if (m_dataStoreService != nullptr) {
@@ -188,4 +218,71 @@ int CNavigatorApp::ExitInstance() {
     m_applicationInfo.reset();
     m_singleInstance.reset();
     return m_exitCode;
+}
+
+void CNavigatorApp::ConnectMessageBroker() {
+    m_messageBroker.reset(GetMessageBroker());
+    if (!m_messageBroker) {
+        std::fputs("No session bus: other programs cannot reach the navigator.\n", stderr);
+        return;
+    }
+    if (m_messageBroker->RegisterService(QStringLiteral("AmbrelService"), &m_instanceManager) !=
+        S_OK) {
+        std::fputs("The navigator's bus name is taken: other programs cannot reach it.\n", stderr);
+        m_messageBroker->Disconnect();
+        m_messageBroker.reset();
+    }
+}
+
+void CNavigatorApp::RunFirstIdleWork() {
+    m_firstIdle = false;
+    LaunchActivityCenter(true);
+    if (NavigatorSettings::Instance() != nullptr && !m_commandLineInfo.SnapshotToNewNote() &&
+        !m_commandLineInfo.OpenRecentItem() && IsStartPanelLaunchOnStart())
+        LaunchStartPanel(m_applicationInfo.get());
+}
+
+void CNavigatorApp::OnActivityCenter() {
+    LaunchActivityCenter(false);
+}
+
+HRESULT CNavigatorApp::CreateItem(DataExchange::IProperties* properties,
+                                  IUnicodeString* itemIdSink) {
+    QString type;
+    UnicodeStringPtr typeSink(&type);
+    if (properties == nullptr || properties->GetProperty(QStringLiteral("type"), &typeSink) != S_OK)
+        return E_FAIL;
+    WNavDS* navigator = WNavDS::Instance();
+    if (type.compare(QStringLiteral("note"), Qt::CaseInsensitive) == 0) {
+        // The catalog knows the kind only in its own spelling.
+        properties->SetProperty(QStringLiteral("type"), QStringLiteral("note"));
+        navigator->NewNote(properties, itemIdSink);
+        return S_OK;
+    }
+    if (type.compare(QStringLiteral("document"), Qt::CaseInsensitive) == 0) {
+        properties->SetProperty(QStringLiteral("type"), QStringLiteral("document"));
+        const HRESULT result = navigator->AddNewItemAndLimit(properties, 0, itemIdSink);
+        navigator->SetChanged(true);
+        return result;
+    }
+    return E_FAIL;
+}
+
+HRESULT CNavigatorApp::UpdateItemProperties(const QString& itemId,
+                                            DataExchange::IProperties* properties) {
+    WNavDS::Instance()->UpdateItem(itemId, properties, false);
+    return S_OK;
+}
+
+HRESULT CNavigatorApp::SaveDocumentToNotebook(const QString& itemId) {
+    WNavDS::Instance()->MoveById(itemId);
+    return S_OK;
+}
+
+HRESULT CNavigatorApp::ForEachWindow(IWindowCallback* callback) {
+    if (callback == nullptr)
+        return E_INVALIDARG;
+    const Platform::WindowHandle window =
+        m_mainWindow ? static_cast<Platform::WindowHandle>(m_mainWindow->winId()) : 0;
+    return callback->Apply(window, 0);
 }

@@ -7,6 +7,9 @@
 #include "catalog/IDataStoreService.h"
 #include "common/ReleasePtr.h"
 #include "libs/toolwell/IDataStoreHost.h"
+#include "libs/toolwell/IMessageBroker.h"
+#include "messaging/CNavInstanceMgr.h"
+#include "messaging/INavigatorService.h"
 #include "ui/WMainFrame.h"
 
 #include <QCoreApplication>
@@ -20,7 +23,7 @@ class IdlePass;
 class TerminationSignals;
 
 // The application object: start-up, the idle pass and shut-down of the navigator.
-class CNavigatorApp final : public QObject {
+class CNavigatorApp final : public QObject, public INavigatorService {
     Q_OBJECT
 public:
     // arguments: the command line, the program first.
@@ -34,6 +37,15 @@ public:
     bool OnIdle(int count);
     int ExitInstance();
 
+    HRESULT CreateItem(DataExchange::IProperties* properties, IUnicodeString* itemIdSink) override;
+    HRESULT UpdateItemProperties(const QString& itemId,
+                                 DataExchange::IProperties* properties) override;
+    HRESULT SaveDocumentToNotebook(const QString& itemId) override;
+    HRESULT ForEachWindow(IWindowCallback* callback) override;
+
+    // The "Activity Center" command.
+    void OnActivityCenter();
+
     WMainFrame* MainWindow() const { return m_mainWindow; }
     Brindle::Application::IApplicationInfo* ApplicationInfoObject() const {
         return m_applicationInfo.get();
@@ -42,6 +54,8 @@ public:
 private:
     bool StartUp();
     void PlaceMainWindow();
+    void ConnectMessageBroker();
+    void RunFirstIdleWork();
 
     QStringList m_arguments;
     std::unique_ptr<SingleInstance> m_singleInstance;
@@ -54,4 +68,7 @@ private:
     std::unique_ptr<IdlePass> m_idlePass;
     std::unique_ptr<TerminationSignals> m_terminationSignals;
     int m_exitCode = 0;
+    CNavInstanceMgr m_instanceManager{this};
+    ReleasePtr<IMessageBroker> m_messageBroker;
+    bool m_firstIdle = true;
 };

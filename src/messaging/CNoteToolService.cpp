@@ -118,6 +118,11 @@ HRESULT CNoteToolService::RemoveWindow(const QString& itemId, int) {
     return S_OK;
 }
 
+HRESULT CNoteToolService::ForgetWindow(Platform::WindowHandle window) {
+    m_openWindows.RemoveWindow(window);
+    return S_OK;
+}
+
 HRESULT CNoteToolService::GetDefaultNoteTitle(IUnicodeString* sink) {
     if (sink == nullptr || m_languageFolder.isEmpty())
         return E_FAIL;

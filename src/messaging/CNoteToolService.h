@@ -30,6 +30,7 @@ public:
     HRESULT SetEventTarget(IWindowEventNotification* target) override;
     HRESULT OnNoteWindowOpened(const QString& itemId, Platform::WindowHandle window) override;
     HRESULT RemoveWindow(const QString& itemId, int flag) override;
+    HRESULT ForgetWindow(Platform::WindowHandle window) override;
     unsigned long Release() override;
     HRESULT GetDefaultNoteTitle(IUnicodeString* sink) override;
     HRESULT GetNoteFileName(IUnicodeString* sink) override;

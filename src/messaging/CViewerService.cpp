@@ -103,6 +103,11 @@ HRESULT CViewerService::RemoveWindow(const QString& itemId, int) {
     return S_OK;
 }
 
+HRESULT CViewerService::ForgetWindow(Platform::WindowHandle window) {
+    m_openWindows.RemoveWindow(window);
+    return S_OK;
+}
+
 HRESULT CViewerService::ActivateDocument(const QString& itemId) {
     if (m_openWindows.Contains(itemId)) {
         if (IItemWindowHub* hub = GetItemWindowHub())

@@ -27,6 +27,7 @@ public:
     HRESULT SetEventTarget(IWindowEventNotification* target) override;
     HRESULT OnDocumentWindowOpened(const QString& itemId, Platform::WindowHandle window) override;
     HRESULT RemoveWindow(const QString& itemId, int flag) override;
+    HRESULT ForgetWindow(Platform::WindowHandle window) override;
     HRESULT ActivateDocument(const QString& itemId) override;
     HRESULT OpenDocument(const QString& itemId, const QString& path) override;
     HRESULT SetRequestingViewer(const QString& itemId) override;

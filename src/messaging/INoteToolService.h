@@ -29,6 +29,8 @@ public:
     virtual HRESULT SetEventTarget(IWindowEventNotification* target) = 0;
     virtual HRESULT OnNoteWindowOpened(const QString& itemId, Platform::WindowHandle window) = 0;
     virtual HRESULT RemoveWindow(const QString& itemId, int flag) = 0;
+    // Forgets the window whatever item it shows: its program has closed it.
+    virtual HRESULT ForgetWindow(Platform::WindowHandle window) = 0;
     virtual unsigned long Release() = 0;
     // String 100 of the note tool's language file; E_FAIL without sink, file or string.
     virtual HRESULT GetDefaultNoteTitle(IUnicodeString* sink) = 0;

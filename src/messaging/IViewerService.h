@@ -27,6 +27,8 @@ public:
     virtual HRESULT OnDocumentWindowOpened(const QString& itemId,
                                            Platform::WindowHandle window) = 0;
     virtual HRESULT RemoveWindow(const QString& itemId, int flag) = 0;
+    // Forgets the window whatever item it shows: its program has closed it.
+    virtual HRESULT ForgetWindow(Platform::WindowHandle window) = 0;
     // Brings the document's window forward, or does so as soon as the window is reported.
     // Answers E_FAIL in both cases.
     virtual HRESULT ActivateDocument(const QString& itemId) = 0;

@@ -17,6 +17,10 @@ public:
         m_windows.insert(Key(itemId), window);
     }
     void Remove(const QString& itemId) { m_windows.remove(Key(itemId)); }
+    // Forgets every item shown in the window.
+    void RemoveWindow(Platform::WindowHandle window) {
+        m_windows.removeIf([window](const auto& entry) { return entry.value() == window; });
+    }
     bool Contains(const QString& itemId) const { return m_windows.contains(Key(itemId)); }
     int Count() const { return static_cast<int>(m_windows.size()); }
 

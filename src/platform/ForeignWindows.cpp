@@ -11,6 +11,7 @@ public:
     bool Close(WindowHandle) override { return false; }
     bool BringToFront(WindowHandle) override { return false; }
     bool Focus(WindowHandle) override { return false; }
+    WindowHandle FindStartPanel() override { return 0; }
 };
 
 IForeignWindows* g_windows = nullptr;

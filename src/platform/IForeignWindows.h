@@ -29,10 +29,12 @@ public:
     virtual bool Close(WindowHandle window) = 0;
     virtual bool BringToFront(WindowHandle window) = 0;
     virtual bool Focus(WindowHandle window) = 0;
+    // The start panel's window while the panel runs, else 0.
+    virtual WindowHandle FindStartPanel() = 0;
 };
 
 // The implementation in use (null restores the built-in one). The built-in one reaches no
-// peer yet, so every window counts as gone until the message bus side installs its own.
+// peer, so every window counts as gone; the message broker installs its own while it runs.
 IForeignWindows& ForeignWindows();
 void SetForeignWindows(IForeignWindows* windows);
 

@@ -28,8 +28,11 @@ public:
         return Record(QStringLiteral("Focus"), window);
     }
 
+    Platform::WindowHandle FindStartPanel() override { return startPanel; }
+
     QList<Request> requests;
     QSet<Platform::WindowHandle> alive;
+    Platform::WindowHandle startPanel = 0;
 
 private:
     bool Record(const QString& operation, Platform::WindowHandle window, int showCommand = -1) {
