@@ -2,8 +2,11 @@
 
 #include "app/ForwardedCommandLine.h"
 #include "app/IdlePass.h"
+#include "libs/lustre/CVisualStyleManager.h"
+#include "libs/sheen/ThemeUtilities.h"
 #include "libs/toolwell/IHarborUtils.h"
 #include "libs/toolwell/ISnapshotService.h"
+#include "libs/toolwell/StartupBubble.h"
 #include "navigator/WNavDS.h"
 #include "settings/NavigatorSettings.h"
 #include "ui/ModalDialog.h"
@@ -105,6 +108,12 @@ bool CNavigatorApp::StartUp() {
     SetSnapshotNoteHandler(
         [](const QString& path) { return WNavDS::Instance()->AddNoteFromFile(path, nullptr); });
 
+    // The look comes first, so the window is made in it.
+    Lustre::CVisualStyleManager* styles = CreateVisualStyleManager();
+    if (styles == nullptr || FAILED(styles->Register(QString::fromUtf16(Lustre::kVisualStylesKey))))
+        return false;
+    InitializeThemeUtilities();
+
     m_mainWindow = new WMainFrame;
     m_mainWindow->setAttribute(Qt::WA_DeleteOnClose);
     PlaceMainWindow();
@@ -128,6 +137,9 @@ bool CNavigatorApp::StartUp() {
     settings->SetKeepOnTop(settings->GetKeepOnTop());
     settings->SetShowMessageCentre(settings->GetShowMessageCentre());
     settings->SetShowFrame(settings->GetShowFrame());
+
+    if (utils->IsStartupBubbleEnabled())
+        m_mainWindow->StartBubbleTimer(StartupBubble::Delay());
 
     m_terminationSignals = std::make_unique<TerminationSignals>();
     connect(m_terminationSignals.get(), &TerminationSignals::Received, this, [this] {
@@ -185,6 +197,9 @@ int CNavigatorApp::ExitInstance() {
     }
     m_dataStoreHost.reset();
     ReleaseHarborUtilsInterface();
+    // Made or not, the look is given up.
+    ShutdownThemeUtilities();
+    DeleteVisualStyleManager();
     m_applicationInfo.reset();
     m_singleInstance.reset();
     return m_exitCode;
