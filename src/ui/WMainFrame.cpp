@@ -83,6 +83,11 @@ WMainFrame::WMainFrame(QWidget* parent) : QMainWindow(parent), m_router(new CCom
             LayOut();
         });
     }
+    // The button that offers the buttons a toolbar has no room for.
+    for (auto* toolbar : findChildren<QToolBar*>()) {
+        if (auto* more = toolbar->findChild<QToolButton*>(QStringLiteral("qt_toolbar_ext_button")))
+            more->setAccessibleName(QStringLiteral("More buttons"));
+    }
     m_router->UpdateActions();
 }
 
@@ -140,6 +145,7 @@ void WMainFrame::CreateToolbars() {
     m_customToolbar->setAccessibleName(QStringLiteral("Items toolbar"));
     m_customToolbar->AddButtons(custom);
     QMenu* show = m_customToolbar->ButtonAction(StringId::Show)->menu();
+    show->setAccessibleName(show->title());
     for (int filter = StringId::FilterNotes; filter <= StringId::FilterOpenedOnly; ++filter)
         show->addAction(m_router->Action(filter));
     m_router->WatchMenu(show);
@@ -190,6 +196,7 @@ QMenu* WMainFrame::AddDropDown(QToolBar* toolbar, int commandId,
     QAction* action = ButtonAction(commandId);
     // The menu belongs to the button, not to the shared entry, which other menus show too.
     auto* menu = new QMenu(Plain(action->text()), this);
+    menu->setAccessibleName(menu->title());
     for (int entry : entries)
         menu->addAction(m_router->Action(entry));
     m_router->WatchMenu(menu);
