@@ -20,6 +20,7 @@
 #include <QCloseEvent>
 #include <QEvent>
 #include <QMenu>
+#include <QPointer>
 #include <QToolButton>
 #include <QVariantAnimation>
 
@@ -36,11 +37,10 @@ bool MessageCentreAvailable() {
 }
 
 // A spacer that takes the toolbar's free width, so the buttons after it sit at its right edge.
-QWidget* Stretch(QToolBar* toolbar) {
+void Stretch(QToolBar* toolbar) {
     auto* spacer = new QWidget(toolbar);
     spacer->setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Preferred);
     toolbar->addWidget(spacer);
-    return spacer;
 }
 
 QString Plain(QString text) {

@@ -5,7 +5,6 @@
 
 #include <QHash>
 #include <QMainWindow>
-#include <QPointer>
 #include <QRect>
 #include <QTimer>
 
