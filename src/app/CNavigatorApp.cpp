@@ -4,8 +4,11 @@
 #include "app/IdlePass.h"
 #include "app/SystemIntegration.h"
 #include "dataexchange/IProperties.h"
+#include "libs/lustre/CVisualStyleManager.h"
+#include "libs/sheen/ThemeUtilities.h"
 #include "libs/toolwell/IHarborUtils.h"
 #include "libs/toolwell/ISnapshotService.h"
+#include "libs/toolwell/StartupBubble.h"
 #include "messaging/ActivityCenter.h"
 #include "messaging/IWindowCallback.h"
 #include "navigator/WNavDS.h"
@@ -120,6 +123,12 @@ bool CNavigatorApp::StartUp() {
     SetSnapshotNoteHandler(
         [](const QString& path) { return WNavDS::Instance()->AddNoteFromFile(path, nullptr); });
 
+    // The look comes first, so the window is made in it.
+    Lustre::CVisualStyleManager* styles = CreateVisualStyleManager();
+    if (styles == nullptr || FAILED(styles->Register(QString::fromUtf16(Lustre::kVisualStylesKey))))
+        return false;
+    InitializeThemeUtilities();
+
     m_mainWindow = new WMainFrame;
     m_mainWindow->setAttribute(Qt::WA_DeleteOnClose);
     PlaceMainWindow();
@@ -150,6 +159,9 @@ bool CNavigatorApp::StartUp() {
     UnicodeStringPtr programFolderSink(&programFolder);
     m_applicationInfo->GetProgramFolder(&programFolderSink);
     RegisterBrowserMenuEntry(programFolder);
+
+    if (utils->IsStartupBubbleEnabled())
+        m_mainWindow->StartBubbleTimer(StartupBubble::Delay());
 
     m_terminationSignals = std::make_unique<TerminationSignals>();
     connect(m_terminationSignals.get(), &TerminationSignals::Received, this, [this] {
@@ -215,6 +227,9 @@ int CNavigatorApp::ExitInstance() {
     }
     m_dataStoreHost.reset();
     ReleaseHarborUtilsInterface();
+    // Made or not, the look is given up.
+    ShutdownThemeUtilities();
+    DeleteVisualStyleManager();
     m_applicationInfo.reset();
     m_singleInstance.reset();
     return m_exitCode;

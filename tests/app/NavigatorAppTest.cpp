@@ -15,6 +15,7 @@
 #include <QPointer>
 #include <QStringDecoder>
 #include <QStringEncoder>
+#include <QTest>
 #include <QTimer>
 
 #include <tuple>
@@ -193,7 +194,13 @@ TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {
     ASSERT_TRUE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
     ASSERT_EQ(launcher.starts.size(), 1) << "the note tool was not started";
 
-    app.MainWindow()->close();
+    // The window fades out, disabled, before the other programs' windows are closed.
+    const QPointer<WMainFrame> window = app.MainWindow();
+    window->close();
+    ASSERT_TRUE(window) << "the window went without fading out";
+    EXPECT_FALSE(window->isEnabled());
+    EXPECT_TRUE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
+    ASSERT_TRUE(QTest::qWaitFor([&] { return window.isNull(); }, 5000));
     EXPECT_FALSE(WNavDS::Instance()->FindItem(noteId)->IsOpen());
     ReleasePtr<DataExchange::IProperties> properties(DataExchange::CreateProperties());
     ASSERT_EQ(GetDataStoreService()->GetProperties(noteId, properties.get()), S_OK);
