@@ -2,12 +2,14 @@
 
 #include "app/CCommandRouter.h"
 #include "app/CNavigatorCommands.h"
+#include "app/SystemIntegration.h"
 #include "common/StringTable.h"
 #include "libs/lustre/CVisualStyleManager.h"
 #include "libs/sheen/ThemeUtilities.h"
 #include "libs/sheen/ThemedToolbar.h"
 #include "libs/toolwell/IHarborUtils.h"
 #include "libs/toolwell/IHelpService.h"
+#include "messaging/ActivityCenter.h"
 #include "navigator/WNavDS.h"
 #include "navigator/WNavigatorTree.h"
 #include "settings/NavigatorSettings.h"
@@ -23,6 +25,8 @@
 #include <QPointer>
 #include <QToolButton>
 #include <QVariantAnimation>
+
+#include <vector>
 
 namespace {
 
@@ -135,11 +139,16 @@ void WMainFrame::CreateToolbars() {
 
     addToolBarBreak(Qt::TopToolBarArea);
     using Description = CNavigatorCustomToolbar::ButtonDescription;
-    const Description custom[] = {
+    std::vector<Description> custom = {
         {StringId::Show, StringId::Show,
          CNavigatorCustomToolbar::StyleDropDown | CNavigatorCustomToolbar::StyleWholeDropDown, 0},
         {StringId::NewFolder, StringId::NewFolder, CNavigatorCustomToolbar::StyleButton, 0},
     };
+    // The activity centre has its button only where it is installed.
+    if (IsActivityCenterInstalled()) {
+        custom.push_back({StringId::ActivityCenter, StringId::ActivityCenter,
+                          CNavigatorCustomToolbar::StyleButton, 0});
+    }
     m_customToolbar = new CNavigatorCustomToolbar(20, 20, this);
     m_customToolbar->setObjectName(QStringLiteral("CustomToolbar"));
     m_customToolbar->setAccessibleName(QStringLiteral("Items toolbar"));
@@ -377,6 +386,8 @@ void WMainFrame::FinishClose() {
     navigator->CloseAllWindowsAndWait();
     navigator->CloseAllOpenDocuments();
     navigator->CloseAllOpenNotes();
+    // The start panel belongs to the navigator's session and ends with it.
+    CloseStartPanel();
     if (IHarborUtils* utils = GetHarborUtilsInterface()) {
         utils->OnNavigatorClosing();
         utils->SetShuttingDown(true);
