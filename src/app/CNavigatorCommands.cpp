@@ -1,5 +1,6 @@
 #include "app/CNavigatorCommands.h"
 
+#include "app/CApplicationCommands.h"
 #include "app/CCommandRouter.h"
 #include "navigator/WNavDS.h"
 #include "navigator/WNavigatorTree.h"
@@ -56,4 +57,22 @@ void CNavigatorCommands::Register(CCommandRouter& router, WNavigatorTree* tree) 
     router.Register({32827, 32834, 32859, 32896}, On(&WNavDS::SendSelectedToWordProcessor,
                                                      &WNavDS::CanSendSelectedToWordProcessor));
     router.Register({32879}, On(&WNavDS::SendSelectedToWordProcessor, &WNavDS::CanPrintSelected));
+    router.Register({32770}, On(&WNavDS::NewWordProcessorDocument));
+    router.Register({32774}, On(&WNavDS::OpenNewDocumentInViewer));
+
+    const std::pair<int, WNavDS::TypeFilter> filters[] = {
+        {32794, WNavDS::TypeFilter::Notes}, {32795, WNavDS::TypeFilter::Qmd},
+        {32796, WNavDS::TypeFilter::Doc},   {32797, WNavDS::TypeFilter::Pdf},
+        {32798, WNavDS::TypeFilter::All},
+    };
+    for (const auto& [id, filter] : filters) {
+        router.Register({id}, {[filter] { Model()->ChooseTypeFilter(filter); }, nullptr,
+                               [filter] { return Model()->IsTypeFilterChosen(filter); }});
+    }
+    router.Register({32799}, {[] { Model()->ToggleOpenedItemsOnly(); }, nullptr,
+                              [] { return Model()->IsOpenedItemsOnly(); }});
+
+    // The tree sits in the navigator's window.
+    CApplicationCommands::Register(
+        router, [editor]() -> QWidget* { return editor ? editor->window() : nullptr; });
 }

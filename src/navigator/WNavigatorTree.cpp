@@ -4,6 +4,7 @@
 #include "common/ReleasePtr.h"
 #include "common/StringTable.h"
 #include "dataexchange/WProperties.h"
+#include "drop/CDropTarget.h"
 #include "navigator/WNavDS.h"
 #include "ui/AmbrelIcons.h"
 
@@ -77,6 +78,8 @@ WNavigatorTree::WNavigatorTree(QWidget* parent) : QTreeWidget(parent), m_inserti
             [this](QTreeWidgetItem* item) { OnExpansionChanged(item, false); });
     connect(this, &QTreeWidget::currentItemChanged, this,
             [this](QTreeWidgetItem* current) { OnCurrentChanged(current); });
+    // Owned by the viewport, so it goes before the tree's own parts.
+    new CDropTarget(viewport(), this);
 }
 
 WNavigatorTree::~WNavigatorTree() {
@@ -710,6 +713,9 @@ void WNavigatorTree::ResetDragState() {
 
 bool WNavigatorTree::DragOverFromOutside(const QPoint& point) {
     WNavDS* model = WNavDS::Instance();
+    // The first move of an outside drag starts the hover and auto-scroll ticks.
+    if (!m_externalDrag)
+        BeginExternalDrag(point);
     m_externalDrag = true;
     m_cursor = point;
     QTreeWidgetItem* item = viewport()->rect().contains(point) ? itemAt(point) : nullptr;
@@ -740,6 +746,11 @@ void WNavigatorTree::BeginExternalDrag(const QPoint& point) {
     m_externalDrag = true;
     m_cursor = point;
     m_dragTimer.start();
+}
+
+void WNavigatorTree::RemoveInsertionMark() {
+    m_insertionLine.Hide();
+    Highlight(nullptr);
 }
 
 void WNavigatorTree::EndExternalDrag() {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "drop/IDropFeedback.h"
 #include "navigator/CTreeInsertionLine.h"
 
 #include <QElapsedTimer>
@@ -23,8 +24,9 @@ class QMenu;
 // The tree of the navigator's window. It shows the records of the data source that pass the
 // filter and turns clicks, keys and drags into calls of the data source's operations. It keeps
 // no item state of its own beyond the node of each shown record: whenever the model's change
-// flag is set it brings itself in line with the records at the next idle pass.
-class WNavigatorTree final : public QTreeWidget {
+// flag is set it brings itself in line with the records at the next idle pass. Files and text
+// dragged from other programs are taken by its drop target, which asks it where they land.
+class WNavigatorTree final : public QTreeWidget, public IDropFeedback {
     Q_OBJECT
 public:
     // The context menus, by the numbers the command table knows them by.
@@ -60,11 +62,13 @@ public:
     // Something from another program is dragged over the point (viewport coordinates): drop
     // target, insertion line, hover expansion and auto-scroll as for an internal drag. Answers
     // whether the place accepts a drop (it must lie under the Notebook).
-    bool DragOverFromOutside(const QPoint& point);
+    bool DragOverFromOutside(const QPoint& point) override;
+    // Hides the insertion line and the highlight; the model's drop target stays for the drop.
+    void RemoveInsertionMark() override;
     // The outside drag entered at the point: the drag timer runs the hover and auto-scroll.
     void BeginExternalDrag(const QPoint& point);
     // The outside drag left or dropped: line, highlight, hover and timer are reset.
-    void EndExternalDrag();
+    void EndExternalDrag() override;
 
     // The tree item that shows the record with this identifier (exact letter case), or null.
     QTreeWidgetItem* ItemOf(const QString& itemId) const;

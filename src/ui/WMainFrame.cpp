@@ -76,7 +76,6 @@ WMainFrame::WMainFrame(QWidget* parent) : QMainWindow(parent), m_router(new CCom
     m_tree->SetCommandRouter(m_router);
     setCentralWidget(m_tree);
     CNavigatorCommands::Register(*m_router, m_tree);
-    RegisterWindowCommands();
     CreateToolbars();
 
     m_bubbleTimer.setSingleShot(true);
@@ -101,20 +100,6 @@ WMainFrame::~WMainFrame() {
     // The settings outlive the window.
     if (NavigatorSettings* settings = NavigatorSettings::Instance(); settings->GetFrame() == this)
         settings->SetFrame(nullptr);
-}
-
-void WMainFrame::RegisterWindowCommands() {
-    const auto settings = [] { return NavigatorSettings::Instance(); };
-    m_router->Register({StringId::KeepOnTop},
-                       {[settings] { settings()->SetKeepOnTop(!settings()->GetKeepOnTop()); },
-                        nullptr, [settings] { return settings()->GetKeepOnTop(); }});
-    m_router->Register({StringId::ShowFrame},
-                       {[settings] { settings()->SetShowFrame(!settings()->GetShowFrame()); },
-                        nullptr, [settings] { return settings()->GetShowFrame(); }});
-    m_router->Register(
-        {StringId::HideMessageCentre},
-        {[settings] { settings()->SetShowMessageCentre(!settings()->GetShowMessageCentre()); },
-         MessageCentreAvailable, [settings] { return settings()->GetShowMessageCentre(); }});
 }
 
 void WMainFrame::CreateToolbars() {

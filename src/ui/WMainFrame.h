@@ -93,7 +93,6 @@ private:
     void AddButton(QToolBar* toolbar, int commandId);
     QMenu* AddDropDown(QToolBar* toolbar, int commandId, std::initializer_list<int> entries);
     void FillHelpMenu(QMenu* menu);
-    void RegisterWindowCommands();
     void LayOut();
     void FinishClose();
     void ShowStartupBubble();

@@ -18,12 +18,11 @@ TEST_F(CommandRouterTest, IdsReachTheirOperationsEnabledByTheSelectionAndUnknown
         bool onLinked;
     };
     // New note, rename, delete, restore, save to notebook, print, send to word processor,
-    // close (nothing is open), mail (not routed here) and an id nobody knows.
+    // close (nothing is open) and an id nobody knows.
     const Row rows[] = {
         {32855, true, true, true},    {32857, false, true, false},  {32858, false, true, true},
         {32901, false, false, false}, {32875, false, false, true},  {32829, false, true, true},
-        {32859, true, true, false},   {32872, false, false, false}, {32828, false, false, false},
-        {12345, false, false, false},
+        {32859, true, true, false},   {32872, false, false, false}, {12345, false, false, false},
     };
     for (const QString& selected : {u"root"_s, note, linked}) {
         model->SelectById(selected);

@@ -3,7 +3,9 @@
 #include <QAccessible>
 #include <QApplication>
 #include <QLineEdit>
+#include <QMimeData>
 #include <QScrollBar>
+#include <QUrl>
 
 namespace {
 
@@ -274,6 +276,36 @@ TEST_F(NavigatorTreeTest, KeysDoubleClickAndTheExpandButtonReachTheModel) {
     tree->OnIdle();
     Key(Qt::Key_Delete);
     EXPECT_TRUE(model->IsInDeletedItems(Item(note)));
+}
+
+TEST_F(NavigatorTreeTest, AFileDroppedFromAnotherProgramBecomesANoteInTheFolderUnderTheCursor) {
+    const QString folder = Folder();
+    const QString other = Folder();
+    const QString text = WriteFile(u"in/minutes.txt"_s, "meeting minutes");
+    WNavDS* model = Show();
+    model->SelectById(other);
+
+    QMimeData data;
+    data.setUrls({QUrl::fromLocalFile(text)});
+    QWidget* viewport = tree->viewport();
+    const QPoint at = At(folder);
+    const Qt::DropActions actions = Qt::CopyAction | Qt::MoveAction;
+    QDragEnterEvent enter(at, actions, &data, Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(viewport, &enter);
+    QDragMoveEvent move(at, actions, &data, Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(viewport, &move);
+    EXPECT_TRUE(move.isAccepted());
+    QDropEvent drop(at, actions, &data, Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(viewport, &drop);
+    EXPECT_TRUE(drop.isAccepted());
+
+    const NavListItemData* note = model->GetSelected();
+    ASSERT_NE(note, nullptr);
+    EXPECT_EQ(note->GetKind(), ItemKindNote);
+    EXPECT_EQ(note->GetTitle(), u"minutes.txt"_s);
+    EXPECT_EQ(note->GetParent(), Item(folder));
+    EXPECT_FALSE(tree->InsertionLine().IsVisible());
+    EXPECT_EQ(tree->HighlightedItem(), nullptr);
 }
 
 } // namespace
