@@ -19,6 +19,9 @@ bool DepthWithin(const pugi::xml_node& document, int limit) {
             node = node.first_child();
             continue;
         }
+        // Text kept in its element counts as the level below it, as a text node would.
+        if (*node.value() != 0 && node.type() == pugi::node_element && depth + 1 >= limit)
+            return false;
         while (node && !node.next_sibling() && node != document) {
             node = node.parent();
             --depth;
@@ -87,8 +90,12 @@ bool XmlDataStoreBase::LoadFrom(const QString& path) {
     if (!IsOpen() || path.isNull())
         return false;
     const QByteArray nativePath = QFile::encodeName(path);
+    // An element's leading text is kept in the element itself instead of a node of its own:
+    // every property value would otherwise cost a node, a third of the document's memory. The
+    // document reads, queries and writes back the same.
     const pugi::xml_parse_result result = m_document->load_file(
-        nativePath.constData(), pugi::parse_default | pugi::parse_declaration);
+        nativePath.constData(),
+        pugi::parse_default | pugi::parse_declaration | pugi::parse_embed_pcdata);
     const bool loaded = result && m_document->document_element() && AcceptDocument(*m_document);
     if (!loaded)
         m_document->reset(); // a failed parse leaves a partial tree behind

@@ -78,6 +78,9 @@ TEST_F(XmlDataStoreTest, MissingCatalogIsCreatedFromTheTemplateAndLoadsEmpty) {
 TEST_F(XmlDataStoreTest, BrokenCatalogsAreRefusedAndNeverWrittenOver) {
     const QByteArray deep =
         QByteArray("<child uuidref=\"x\">").repeated(600) + QByteArray("</child>").repeated(600);
+    // Elements one level short of the bound, with text at the bound.
+    const QByteArray deepText = QByteArray("<child uuidref=\"x\">").repeated(509) + "x" +
+                                QByteArray("</child>").repeated(509);
     const QByteArray good = CatalogText("", "");
     const QList<QByteArray> broken = {
         QByteArray("<archive><items></archive>"), // malformed
@@ -85,6 +88,7 @@ TEST_F(XmlDataStoreTest, BrokenCatalogsAreRefusedAndNeverWrittenOver) {
         QByteArray(),                             // empty
         QByteArray("<?xml version=\"1.0\"?>"),    // no document element
         CatalogText(deep.constData(), ""),        // nested beyond the bound
+        CatalogText(deepText.constData(), ""),    // its text nested beyond the bound
     };
     for (const QByteArray& content : broken) {
         SCOPED_TRACE(content.left(60).toStdString());
