@@ -307,6 +307,32 @@ TEST_F(XmlDataStoreTest, SavedCatalogIsUtf16AndKeepsEveryCharacter) {
     }
 }
 
+TEST_F(XmlDataStoreTest, LargeUtf16CatalogReadsBackEveryCharacter) {
+    // The file is read a mebibyte at a time: a surrogate pair is put across the first boundary.
+    const QString head = QString::fromUtf8(CatalogText("<child uuidref=\"A\"/>", ""))
+                             .chopped(18) + // "</items></archive>"
+                         QStringLiteral("<note uuid=\"A\"><properties><title>");
+    const qsizetype lead = (1 << 19) - 1; // the unit that ends the first piece
+    const QString title =
+        QString(lead - head.size(), u'x') + QStringLiteral("\U0001F600\u00E9 end");
+    const QString text =
+        head + title + QStringLiteral("</title></properties></note></items></archive>");
+    QByteArray bytes("\xFF\xFE");
+    for (const QChar c : text) {
+        bytes.append(static_cast<char>(c.unicode() & 0xFF));
+        bytes.append(static_cast<char>(c.unicode() >> 8));
+    }
+    WriteCatalog(bytes);
+    bool loaded = false;
+    auto store = OpenStore(&loaded);
+    ASSERT_TRUE(loaded);
+    QString read;
+    EXPECT_TRUE(store->ReadProperty(kA, QStringLiteral("title"), &read));
+    EXPECT_EQ(read.right(8), title.right(8));
+    EXPECT_EQ(read.size(), title.size());
+    EXPECT_EQ(Children(*store, kRoot), QStringList{kA});
+}
+
 // The indexes must answer exactly what the catalog's XPath queries answer, whatever sequence
 // of edits came before, on a hand-edited file with duplicates and a reference to A inside A.
 TEST_F(XmlDataStoreTest, IndexesAnswerAsTheXPathQueriesAfterRandomEdits) {
