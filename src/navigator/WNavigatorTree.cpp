@@ -228,21 +228,17 @@ NavTreeNode* WNavigatorTree::NewNode(const QString& key) {
 NavTreeNode* WNavigatorTree::ShowRecord(NavListItemData* record) {
     const QString& key = record->GetItemId();
     NavTreeNode* node = NodeFor(record);
-    if (node != nullptr && !SameText(node->key, key))
-        node = nullptr; // the record took another identifier
+    if (node == nullptr || !SameText(node->key, key))
+        node = m_nodes.value(key); // a new record, or one that took another identifier
+    // Shown already, as a parent: once only, or it would be placed twice.
     if (node != nullptr && node->seenIn == m_generation)
         return node;
     NavTreeNode* parent =
         record->GetParent() != nullptr ? ShowRecord(record->GetParent()) : nullptr;
-    if (node == nullptr) {
-        node = m_nodes.value(key);
-        if (node == nullptr)
-            node = NewNode(key);
-    }
-    if (node->recordKey != record) {
-        node->recordKey = record;
-        record->SetTreeSlot(node->slot);
-    }
+    if (node == nullptr)
+        node = NewNode(key);
+    node->recordKey = record;
+    record->SetTreeSlot(node->slot);
     node->record = record;
     node->seenIn = m_generation;
     node->listed = false;
