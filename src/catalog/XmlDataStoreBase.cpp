@@ -59,10 +59,11 @@ void DeclareUtf16(pugi::xml_document* document) {
     encoding = "UTF-16";
 }
 
-// Appends the UTF-8 form of UTF-16 LE code units, as the parser would convert them: a
-// surrogate without its partner is left out. A lead at the end of the units waits in `lead`
-// for the next call.
-void AppendUtf8(const char* bytes, qsizetype units, char16_t* lead, QByteArray* out) {
+// Writes the UTF-8 form of UTF-16 LE code units to out (room for three bytes a unit), as the
+// parser would convert them: a surrogate without its partner is left out. A lead at the end
+// of the units waits in `lead` for the next call. Answers the bytes written.
+qsizetype ToUtf8(const char* bytes, qsizetype units, char16_t* lead, char* out) {
+    char* const start = out;
     for (qsizetype at = 0; at < units; ++at) {
         const auto unit = static_cast<char16_t>(static_cast<unsigned char>(bytes[2 * at]) |
                                                 static_cast<unsigned char>(bytes[2 * at + 1]) << 8);
@@ -71,29 +72,27 @@ void AppendUtf8(const char* bytes, qsizetype units, char16_t* lead, QByteArray* 
             *lead = 0;
             if (unit >= 0xDC00 && unit < 0xE000) {
                 const char32_t c = 0x10000 + ((first & 0x3FFu) << 10) + (unit & 0x3FFu);
-                const char encoded[] = {static_cast<char>(0xF0 | (c >> 18)),
-                                        static_cast<char>(0x80 | ((c >> 12) & 0x3F)),
-                                        static_cast<char>(0x80 | ((c >> 6) & 0x3F)),
-                                        static_cast<char>(0x80 | (c & 0x3F))};
-                out->append(encoded, 4);
+                *out++ = static_cast<char>(0xF0 | (c >> 18));
+                *out++ = static_cast<char>(0x80 | ((c >> 12) & 0x3F));
+                *out++ = static_cast<char>(0x80 | ((c >> 6) & 0x3F));
+                *out++ = static_cast<char>(0x80 | (c & 0x3F));
                 continue;
             }
         }
         if (unit < 0x80) {
-            out->append(static_cast<char>(unit));
+            *out++ = static_cast<char>(unit);
         } else if (unit < 0x800) {
-            const char encoded[] = {static_cast<char>(0xC0 | (unit >> 6)),
-                                    static_cast<char>(0x80 | (unit & 0x3F))};
-            out->append(encoded, 2);
+            *out++ = static_cast<char>(0xC0 | (unit >> 6));
+            *out++ = static_cast<char>(0x80 | (unit & 0x3F));
         } else if (unit >= 0xD800 && unit < 0xDC00) {
             *lead = unit;
         } else if (unit < 0xDC00 || unit >= 0xE000) {
-            const char encoded[] = {static_cast<char>(0xE0 | (unit >> 12)),
-                                    static_cast<char>(0x80 | ((unit >> 6) & 0x3F)),
-                                    static_cast<char>(0x80 | (unit & 0x3F))};
-            out->append(encoded, 3);
+            *out++ = static_cast<char>(0xE0 | (unit >> 12));
+            *out++ = static_cast<char>(0x80 | ((unit >> 6) & 0x3F));
+            *out++ = static_cast<char>(0x80 | (unit & 0x3F));
         }
     }
+    return out - start;
 }
 
 // The UTF-8 text of a file in UTF-16 LE with byte-order mark (the form the store writes), read
@@ -111,6 +110,7 @@ QByteArray ReadUtf16File(const QString& path) {
     QByteArray text;
     text.reserve(file.size() / 2 + 1); // exact for text in ASCII; grows for the rest
     QByteArray piece(1 << 20, Qt::Uninitialized);
+    QByteArray converted(3 * piece.size() / 2, Qt::Uninitialized);
     char16_t lead = 0;
     qsizetype carried = 0; // a byte of a unit split between pieces
     for (;;) {
@@ -120,7 +120,8 @@ QByteArray ReadUtf16File(const QString& path) {
         if (read == 0)
             break;
         const qsizetype bytes = carried + read;
-        AppendUtf8(piece.constData(), bytes / 2, &lead, &text);
+        text.append(converted.constData(),
+                    ToUtf8(piece.constData(), bytes / 2, &lead, converted.data()));
         carried = bytes % 2;
         if (carried != 0)
             piece[0] = piece[bytes - 1];
