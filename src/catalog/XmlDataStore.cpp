@@ -56,15 +56,16 @@ pugi::xml_node NextInSubtree(pugi::xml_node node, const pugi::xml_node& top) {
     return {};
 }
 
-// The text of an element as XPath sees it: all text below it, in order.
+// The text of an element as XPath sees it: all text below it, in order, after the leading
+// text that a loaded element keeps itself.
 QString StringValue(const pugi::xml_node& element) {
     const pugi::xml_node first = element.first_child();
     if (!first)
-        return QStringLiteral("");
-    if (!first.next_sibling() &&
+        return QString::fromUtf8(element.value());
+    if (*element.value() == 0 && !first.next_sibling() &&
         (first.type() == pugi::node_pcdata || first.type() == pugi::node_cdata))
         return QString::fromUtf8(first.value());
-    QByteArray text;
+    QByteArray text(element.value());
     for (pugi::xml_node n = first; n; n = NextInSubtree(n, element)) {
         if (n.type() == pugi::node_pcdata || n.type() == pugi::node_cdata)
             text += n.value();
@@ -212,6 +213,9 @@ bool XmlDataStore::AcceptDocument(const pugi::xml_document& document) {
             node = node.first_child();
             continue;
         }
+        // Text kept in its element counts as the level below it, as a text node would.
+        if (*node.value() != 0 && node.type() == pugi::node_element && depth + 1 >= kMaxDepth)
+            return false;
         while (node && !node.next_sibling()) {
             node = node.parent();
             --depth;
@@ -365,9 +369,12 @@ bool XmlDataStore::IsLastProperty(const QString& id, const QString& name,
         return false;
     // Exactly what AddProperty makes of the value.
     const pugi::xml_node text = property.first_child();
+    const bool ownText = *property.value() != 0; // kept in the element by the load
     if (value.isEmpty())
-        return !text;
+        return !text && !ownText;
     const pugi::xml_node_type type = IsWhitespaceOnly(value) ? pugi::node_cdata : pugi::node_pcdata;
+    if (ownText)
+        return !text && type == pugi::node_pcdata && QString::fromUtf8(property.value()) == value;
     return text && !text.next_sibling() && text.type() == type &&
            QString::fromUtf8(text.value()) == value;
 }

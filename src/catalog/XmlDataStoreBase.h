@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QByteArray>
 #include <QString>
 
 #include <pugixml.hpp>
@@ -54,6 +55,9 @@ private:
     bool IsSavable() const;
 
     int m_open = 0;
+    // The text the loaded document was parsed in place from: the document's strings point
+    // into it, so it goes only after the document.
+    QByteArray m_text;
     std::unique_ptr<pugi::xml_document> m_document;
     QString m_path;
     bool m_loadFailed = false;

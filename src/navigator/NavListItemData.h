@@ -1,5 +1,7 @@
 #pragma once
 
+#include "navigator/NavChangeLog.h"
+
 #include <QString>
 
 #include <cstdint>
@@ -37,29 +39,68 @@ public:
                     const QString& dateAccessed);
 
     ItemKind GetKind() const { return m_kind; }
-    void SetKind(ItemKind kind) { m_kind = kind; }
+    void SetKind(ItemKind kind) {
+        m_kind = kind;
+        Changed();
+    }
     const QString& GetTitle() const { return m_title; }
-    void SetTitle(const QString& title) { m_title = title; }
+    void SetTitle(const QString& title) {
+        m_title = title;
+        Changed();
+    }
     const QString& GetItemId() const { return m_itemId; }
-    void SetItemId(const QString& itemId) { m_itemId = itemId; }
+    void SetItemId(const QString& itemId) {
+        m_itemId = itemId;
+        StructureChanged();
+    }
     const QString& GetDateCreated() const { return m_dateCreated; }
     void SetDateCreated(const QString& date) { m_dateCreated = date; }
     const QString& GetDateAccessed() const { return m_dateAccessed; }
     void SetDateAccessed(const QString& date) { m_dateAccessed = date; }
     NavListItemData* GetParent() const { return m_parent; }
-    void SetParent(NavListItemData* parent) { m_parent = parent; }
+    void SetParent(NavListItemData* parent) {
+        m_parent = parent;
+        StructureChanged();
+    }
     NavListItemData* GetRestoreParent() const { return m_restoreParent; }
     void SetRestoreParent(NavListItemData* parent) { m_restoreParent = parent; }
     bool IsExpanded() const { return m_expanded; }
-    void SetExpanded(bool expanded) { m_expanded = expanded; }
+    void SetExpanded(bool expanded) {
+        m_expanded = expanded;
+        Changed();
+    }
     bool IsLinked() const { return m_linked; }
-    void SetLinked(bool linked) { m_linked = linked; }
+    void SetLinked(bool linked) {
+        m_linked = linked;
+        Changed();
+    }
     bool IsOpen() const { return m_open; }
-    void SetOpen(bool open) { m_open = open; }
+    void SetOpen(bool open) {
+        m_open = open;
+        Changed();
+    }
     DocumentSubtype GetSubtype() const { return m_subtype; }
-    void SetSubtype(DocumentSubtype subtype) { m_subtype = subtype; }
+    void SetSubtype(DocumentSubtype subtype) {
+        m_subtype = subtype;
+        Changed();
+    }
+
+    // Where the changes of the record are noted for the tree; none for a record outside a model.
+    void SetChangeLog(NavChangeLog* log) { m_changeLog = log; }
+    // The tree's own number for the node that shows the record; the tree checks it before use.
+    int GetTreeSlot() const { return m_treeSlot; }
+    void SetTreeSlot(int slot) { m_treeSlot = slot; }
 
 private:
+    void Changed() {
+        if (m_changeLog != nullptr)
+            m_changeLog->RecordChanged(this);
+    }
+    void StructureChanged() {
+        if (m_changeLog != nullptr)
+            m_changeLog->StructureChanged();
+    }
+
     ItemKind m_kind;
     QString m_title;
     QString m_itemId;
@@ -71,6 +112,8 @@ private:
     bool m_linked;
     bool m_open;
     DocumentSubtype m_subtype;
+    int m_treeSlot = -1;
+    NavChangeLog* m_changeLog = nullptr;
 };
 
 // The tree's type filter: one of the five type options is meant to be set, "open only" is
@@ -82,6 +125,7 @@ struct ItemFilter {
     bool showPdf = false;
     bool showAllTypes = true;
     bool showOpenedItemsOnly = false;
+    bool operator==(const ItemFilter&) const = default;
 };
 
 // Whether the tree shows the item under the filter. Folders are always shown, items of

@@ -120,6 +120,8 @@ void WNavDS::Initialize() {
 
 NavListItemData* WNavDS::AppendRecord(std::unique_ptr<NavListItemData> record) {
     NavListItemData* raw = record.get();
+    raw->SetChangeLog(&m_changeLog);
+    m_changeLog.StructureChanged();
     m_items.push_back(std::move(record));
     m_positions.insert(raw, std::prev(m_items.end()));
     m_index[Folded(raw->GetItemId())].append(raw);
@@ -139,6 +141,7 @@ void WNavDS::RemoveRecord(NavListItemData* record) {
         m_selected = nullptr;
     if (m_dropTarget == record)
         m_dropTarget = nullptr;
+    m_changeLog.StructureChanged();
     const ItemList::iterator at = position.value();
     m_positions.erase(position);
     m_items.erase(at);
@@ -484,6 +487,7 @@ void WNavDS::Clear() {
     m_deletedItems = nullptr;
     m_linkedDocuments = nullptr;
     m_notebook = nullptr;
+    m_changeLog.StructureChanged();
     m_positions.clear();
     m_index.clear();
     m_items.clear();
@@ -556,7 +560,7 @@ bool WNavDS::DropTargetAccepts(bool toNotebookOnly) const {
     return toNotebookOnly ? top == m_notebook : top != m_linkedDocuments;
 }
 
-bool WNavDS::IsItemVisible(const NavListItemData* item) const {
+ItemFilter WNavDS::CurrentFilter() const {
     ItemFilter filter;
     NavigatorSettings* settings = NavigatorSettings::Instance();
     if (settings->GetRecord() != nullptr) {
@@ -567,7 +571,11 @@ bool WNavDS::IsItemVisible(const NavListItemData* item) const {
         filter.showAllTypes = settings->GetShowAllTypes();
         filter.showOpenedItemsOnly = settings->GetShowOpenedItemsOnly();
     }
-    return ::IsItemVisible(item, filter);
+    return filter;
+}
+
+bool WNavDS::IsItemVisible(const NavListItemData* item) const {
+    return ::IsItemVisible(item, CurrentFilter());
 }
 
 int WNavDS::ImageIndexOf(const NavListItemData* item) const {

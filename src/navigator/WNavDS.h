@@ -91,6 +91,11 @@ public:
     Position GetEndPosition() const { return m_items.cend(); }
     const ItemList& GetItems() const { return m_items; }
 
+    // Which records changed since the tree last followed the model.
+    NavChangeLog& GetChangeLog() { return m_changeLog; }
+    // The tree's filter as the settings hold it now.
+    ItemFilter CurrentFilter() const;
+
     bool IsChanged() const { return m_changed; }
     void SetChanged(bool changed) { m_changed = changed; }
     bool IsRenamePending() const { return m_renamePending; }
@@ -154,6 +159,8 @@ private:
     NavListItemData* m_linkedDocuments = nullptr;
     NavListItemData* m_dropTarget = nullptr;
     NavListItemData* m_notebook = nullptr;
+    // Before the records, which note their changes in it.
+    NavChangeLog m_changeLog;
     ItemList m_items;
     // Where each record sits in the list, and the records of each case-folded identifier
     // (more than one only when the catalog holds ids that differ in letter case).

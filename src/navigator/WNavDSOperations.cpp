@@ -424,6 +424,7 @@ void WNavDS::MoveRecordBefore(NavListItemData* item, NavListItemData* before) {
             }
         }
     }
+    m_changeLog.StructureChanged();
     ItemList::iterator destination = m_items.end();
     if (before != nullptr) {
         const auto found = m_positions.constFind(before);

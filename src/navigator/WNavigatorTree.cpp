@@ -33,6 +33,10 @@ public:
     NavListItemData* record = nullptr;
     // The record the node was last found by; only compared, never followed.
     const NavListItemData* recordKey = nullptr;
+    // Its number in the tree's slots, carried by the record.
+    int slot = -1;
+    // The record passed the filter at the last walk (it may be shown only as a parent).
+    bool listed = false;
     NavTreeNode* wantedParent = nullptr;
     std::vector<NavTreeNode*> wanted;
     QString title;
@@ -111,6 +115,45 @@ void WNavigatorTree::Rebuild() {
     QTreeWidgetItem* before = currentItem();
     m_followingModel = true;
 
+    if (!FollowChangedRecords(model))
+        WalkAllRecords(model);
+    NavChangeLog& log = model->GetChangeLog();
+    log.Clear();
+    m_followedModel = model;
+    m_followedClearing = log.Clearing();
+    m_followedFilter = model->CurrentFilter();
+
+    NavListItemData* selected = model->GetSelected();
+    QTreeWidgetItem* current = selected != nullptr ? m_nodes.value(selected->GetItemId()) : nullptr;
+    if (current != currentItem())
+        setCurrentItem(current);
+    if (current != nullptr && current != before)
+        scrollToItem(current);
+    m_followingModel = false;
+}
+
+bool WNavigatorTree::FollowChangedRecords(WNavDS* model) {
+    const NavChangeLog& log = model->GetChangeLog();
+    if (log.IsStructureChanged() || model != m_followedModel ||
+        log.Clearing() != m_followedClearing || model->CurrentFilter() != m_followedFilter)
+        return false;
+    // The records' places are as the last walk left them; only their own state changed.
+    for (NavListItemData* record : log.ChangedRecords()) {
+        NavTreeNode* node = NodeFor(record);
+        const bool listed = model->IsItemVisible(record);
+        if (node == nullptr ? listed : node->listed != listed)
+            return false; // it comes or goes
+    }
+    for (NavListItemData* record : log.ChangedRecords()) {
+        if (NavTreeNode* node = NodeFor(record)) {
+            ShowState(node, record);
+            SyncExpansion(node, record);
+        }
+    }
+    return true;
+}
+
+void WNavigatorTree::WalkAllRecords(WNavDS* model) {
     ++m_generation;
     m_wantedTopLevel.clear();
     m_shown.clear();
@@ -119,7 +162,7 @@ void WNavigatorTree::Rebuild() {
     // node, in order. m_shown lists parents before their children.
     WNavDS::Position position = model->GetFirstPosition();
     while (NavListItemData* record = model->ForEachVisible(position))
-        ShowRecord(record);
+        ShowRecord(record)->listed = true;
 
     QStringList gone;
     if (m_shown.size() != static_cast<std::size_t>(m_nodes.size())) {
@@ -147,17 +190,9 @@ void WNavigatorTree::Rebuild() {
             SyncExpansion(node, node->record);
     }
 
-    NavListItemData* selected = model->GetSelected();
-    QTreeWidgetItem* current = selected != nullptr ? m_nodes.value(selected->GetItemId()) : nullptr;
-    if (current != currentItem())
-        setCurrentItem(current);
-    if (current != nullptr && current != before)
-        scrollToItem(current);
-
     for (NavTreeNode* node : m_shown)
         node->record = nullptr;
     m_shown.clear();
-    m_followingModel = false;
 }
 
 namespace {
@@ -170,30 +205,46 @@ bool SameText(const QString& a, const QString& b) {
 
 } // namespace
 
+NavTreeNode* WNavigatorTree::NodeFor(const NavListItemData* record) const {
+    const int slot = record->GetTreeSlot();
+    if (slot < 0 || static_cast<std::size_t>(slot) >= m_slots.size())
+        return nullptr;
+    NavTreeNode* node = m_slots[static_cast<std::size_t>(slot)];
+    // The number may be another tree's, or left from a node that has gone.
+    return node != nullptr && node->recordKey == record ? node : nullptr;
+}
+
+NavTreeNode* WNavigatorTree::NewNode(const QString& key) {
+    auto* node = new NavTreeNode(key);
+    if (m_freeSlots.empty()) {
+        node->slot = static_cast<int>(m_slots.size());
+        m_slots.push_back(node);
+    } else {
+        node->slot = m_freeSlots.back();
+        m_freeSlots.pop_back();
+        m_slots[static_cast<std::size_t>(node->slot)] = node;
+    }
+    m_nodes.insert(key, node);
+    return node;
+}
+
 NavTreeNode* WNavigatorTree::ShowRecord(NavListItemData* record) {
     const QString& key = record->GetItemId();
-    NavTreeNode* node = m_byRecord.value(record);
-    if (node != nullptr && !SameText(node->key, key))
-        node = nullptr; // a new record where a freed one was
+    NavTreeNode* node = NodeFor(record);
+    if (node == nullptr || !SameText(node->key, key))
+        node = m_nodes.value(key); // a new record, or one that took another identifier
+    // Shown already, as a parent: once only, or it would be placed twice.
     if (node != nullptr && node->seenIn == m_generation)
         return node;
     NavTreeNode* parent =
         record->GetParent() != nullptr ? ShowRecord(record->GetParent()) : nullptr;
-    if (node == nullptr) {
-        node = m_nodes.value(key);
-        if (node == nullptr) {
-            node = new NavTreeNode(key);
-            m_nodes.insert(key, node);
-        }
-    }
-    if (node->recordKey != record) {
-        if (m_byRecord.value(node->recordKey) == node)
-            m_byRecord.remove(node->recordKey);
-        node->recordKey = record;
-        m_byRecord.insert(record, node);
-    }
+    if (node == nullptr)
+        node = NewNode(key);
+    node->recordKey = record;
+    record->SetTreeSlot(node->slot);
     node->record = record;
     node->seenIn = m_generation;
+    node->listed = false;
     node->wanted.clear();
     node->wantedParent = parent;
     (parent != nullptr ? parent->wanted : m_wantedTopLevel).push_back(node);
@@ -209,7 +260,11 @@ NavTreeNode* WNavigatorTree::ShowRecord(NavListItemData* record) {
         else
             takeTopLevelItem(indexOfTopLevelItem(node));
     }
+    ShowState(node, record);
+    return node;
+}
 
+void WNavigatorTree::ShowState(NavTreeNode* node, const NavListItemData* record) {
     const int image = WNavDS::Instance()->ImageIndexOf(record);
     if (image != node->image) {
         node->image = image;
@@ -221,7 +276,6 @@ NavTreeNode* WNavigatorTree::ShowRecord(NavListItemData* record) {
         node->title = record->GetTitle();
         node->setText(0, node->title);
     }
-    return node;
 }
 
 void WNavigatorTree::PlaceChildren(NavTreeNode* parent, const std::vector<NavTreeNode*>& wanted) {
@@ -253,8 +307,8 @@ void WNavigatorTree::DropNode(NavTreeNode* node) {
         if (NavTreeNode* below = NodeOf(item)) {
             if (m_nodes.value(below->key) == below)
                 m_nodes.remove(below->key);
-            if (m_byRecord.value(below->recordKey) == below)
-                m_byRecord.remove(below->recordKey);
+            m_slots[static_cast<std::size_t>(below->slot)] = nullptr;
+            m_freeSlots.push_back(below->slot);
         }
         for (int index = 0; index < item->childCount(); ++index)
             pending.append(item->child(index));

@@ -2,6 +2,7 @@
 
 #include "drop/IDropFeedback.h"
 #include "navigator/CTreeInsertionLine.h"
+#include "navigator/NavListItemData.h"
 
 #include <QElapsedTimer>
 #include <QHash>
@@ -17,8 +18,8 @@
 #include <vector>
 
 class CCommandRouter;
-class NavListItemData;
 class NavTreeNode;
+class WNavDS;
 class QMenu;
 
 // The tree of the navigator's window. It shows the records of the data source that pass the
@@ -101,7 +102,15 @@ protected:
 private:
     friend class NavTreeLabelDelegate;
 
+    // Brings the nodes of the changed records in line when nothing else changed since the
+    // last rebuild; false when every record has to be walked.
+    bool FollowChangedRecords(WNavDS* model);
+    void WalkAllRecords(WNavDS* model);
     NavTreeNode* ShowRecord(NavListItemData* record);
+    // The node that shows the record, found by the number the record carries.
+    NavTreeNode* NodeFor(const NavListItemData* record) const;
+    NavTreeNode* NewNode(const QString& key);
+    void ShowState(NavTreeNode* node, const NavListItemData* record);
     NavTreeNode* NodeOf(const QTreeWidgetItem* item) const;
     NavListItemData* RecordOf(const QTreeWidgetItem* item) const;
     void PlaceChildren(NavTreeNode* parent, const std::vector<NavTreeNode*>& wanted);
@@ -130,8 +139,13 @@ private:
     qint64 Now() const;
 
     QHash<QString, NavTreeNode*> m_nodes;
-    // The same nodes by the record they showed last, the quick way in during a rebuild.
-    QHash<const NavListItemData*, NavTreeNode*> m_byRecord;
+    // The same nodes by number, the quick way in from a record; free numbers are used again.
+    std::vector<NavTreeNode*> m_slots;
+    std::vector<int> m_freeSlots;
+    // The model, its change log's clearing and the filter as the last rebuild left them.
+    const WNavDS* m_followedModel = nullptr;
+    quint64 m_followedClearing = 0;
+    ItemFilter m_followedFilter;
     quint64 m_generation = 0;
     // During a rebuild: the wanted top-level items, and every shown node, parents first.
     std::vector<NavTreeNode*> m_wantedTopLevel;

@@ -229,6 +229,9 @@ TEST_F(DataStoreServiceTest, SaveWritesTheFileOnlyAfterTheCatalogChanged) {
         Service()->Shutdown(1);
         Service();
     });
+    expectUntouched("same last value, read back", [&] {
+        Service()->UpdateProperties(note, Properties({{"title", "n"}}).get());
+    });
 
     const std::pair<const char*, std::function<void()>> changes[] = {
         {"note", [&] { Note("x"); }},

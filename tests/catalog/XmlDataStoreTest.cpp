@@ -78,6 +78,9 @@ TEST_F(XmlDataStoreTest, MissingCatalogIsCreatedFromTheTemplateAndLoadsEmpty) {
 TEST_F(XmlDataStoreTest, BrokenCatalogsAreRefusedAndNeverWrittenOver) {
     const QByteArray deep =
         QByteArray("<child uuidref=\"x\">").repeated(600) + QByteArray("</child>").repeated(600);
+    // Elements one level short of the bound, with text at the bound.
+    const QByteArray deepText = QByteArray("<child uuidref=\"x\">").repeated(509) + "x" +
+                                QByteArray("</child>").repeated(509);
     const QByteArray good = CatalogText("", "");
     const QList<QByteArray> broken = {
         QByteArray("<archive><items></archive>"), // malformed
@@ -85,6 +88,7 @@ TEST_F(XmlDataStoreTest, BrokenCatalogsAreRefusedAndNeverWrittenOver) {
         QByteArray(),                             // empty
         QByteArray("<?xml version=\"1.0\"?>"),    // no document element
         CatalogText(deep.constData(), ""),        // nested beyond the bound
+        CatalogText(deepText.constData(), ""),    // its text nested beyond the bound
     };
     for (const QByteArray& content : broken) {
         SCOPED_TRACE(content.left(60).toStdString());
@@ -301,6 +305,32 @@ TEST_F(XmlDataStoreTest, SavedCatalogIsUtf16AndKeepsEveryCharacter) {
         EXPECT_TRUE(reloaded->ReadProperty(id, name, &read));
         EXPECT_EQ(read, value);
     }
+}
+
+TEST_F(XmlDataStoreTest, LargeUtf16CatalogReadsBackEveryCharacter) {
+    // The file is read a mebibyte at a time: a surrogate pair is put across the first boundary.
+    const QString head = QString::fromUtf8(CatalogText("<child uuidref=\"A\"/>", ""))
+                             .chopped(18) + // "</items></archive>"
+                         QStringLiteral("<note uuid=\"A\"><properties><title>");
+    const qsizetype lead = (1 << 19) - 1; // the unit that ends the first piece
+    const QString title =
+        QString(lead - head.size(), u'x') + QStringLiteral("\U0001F600\u00E9 end");
+    const QString text =
+        head + title + QStringLiteral("</title></properties></note></items></archive>");
+    QByteArray bytes("\xFF\xFE");
+    for (const QChar c : text) {
+        bytes.append(static_cast<char>(c.unicode() & 0xFF));
+        bytes.append(static_cast<char>(c.unicode() >> 8));
+    }
+    WriteCatalog(bytes);
+    bool loaded = false;
+    auto store = OpenStore(&loaded);
+    ASSERT_TRUE(loaded);
+    QString read;
+    EXPECT_TRUE(store->ReadProperty(kA, QStringLiteral("title"), &read));
+    EXPECT_EQ(read.right(8), title.right(8));
+    EXPECT_EQ(read.size(), title.size());
+    EXPECT_EQ(Children(*store, kRoot), QStringList{kA});
 }
 
 // The indexes must answer exactly what the catalog's XPath queries answer, whatever sequence

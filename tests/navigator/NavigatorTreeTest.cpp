@@ -2,10 +2,14 @@
 
 #include <QAccessible>
 #include <QApplication>
+#include <QImage>
 #include <QLineEdit>
 #include <QMimeData>
 #include <QScrollBar>
 #include <QUrl>
+
+#include <functional>
+#include <utility>
 
 namespace {
 
@@ -71,6 +75,75 @@ TEST_F(NavigatorTreeTest, RebuildFollowsTheModelKeepingItemsExpansionAndScroll) 
     EXPECT_EQ(ChildrenOf(u"root"_s), notebook);
     EXPECT_TRUE(folderItem->isExpanded());
     EXPECT_EQ(tree->verticalScrollBar()->value(), 6);
+}
+
+// The tree's items, depth-first: depth, title, expansion and picture of each.
+QStringList Picture(const QTreeWidget& tree) {
+    QStringList lines;
+    QList<std::pair<QTreeWidgetItem*, int>> pending;
+    for (int index = tree.topLevelItemCount() - 1; index >= 0; --index)
+        pending.append({tree.topLevelItem(index), 0});
+    while (!pending.isEmpty()) {
+        const auto [item, depth] = pending.takeLast();
+        const QImage image = item->icon(0).pixmap(16).toImage();
+        lines.append(
+            u"%1%2 %3 %4"_s.arg(QString(depth, u' '), item->text(0))
+                .arg(item->isExpanded())
+                .arg(qHashBits(image.constBits(), static_cast<size_t>(image.sizeInBytes()))));
+        for (int index = item->childCount() - 1; index >= 0; --index)
+            pending.append({item->child(index), depth + 1});
+    }
+    return lines;
+}
+
+// After each change the tree that followed the model from one idle pass to the next must look
+// exactly like a tree built afresh from the model.
+TEST_F(NavigatorTreeTest, FollowingChangesGivesTheTreeAFullRebuildGives) {
+    const QString folder = Folder();
+    const QString inner = Folder(folder);
+    const QString deep = Add(u"note"_s, inner, {{u"title"_s, u"Deep"_s}});
+    const QString note = Add(u"note"_s, folder, {{u"title"_s, u"Note"_s}});
+    const QString other = Add(u"note"_s, u"root"_s, {{u"title"_s, u"Other"_s}});
+    const QString target = Folder();
+    WNavDS* model = Show();
+    const std::pair<const char*, std::function<void()>> changes[] = {
+        {"rename",
+         [&] {
+             Update(note, {{u"title"_s, u"Renamed"_s}});
+         }},
+        {"expand", [&] { model->SetExpanded(Item(inner), true); }},
+        {"open", [&] { Update(other, kOpen); }},
+        {"opened items only", [&] { model->ToggleOpenedItemsOnly(); }},
+        {"open after the filter switch", [&] { Update(deep, kOpen); }},
+        {"close under the filter",
+         [&] {
+             Update(other, {{u"open"_s, u"false"_s}});
+         }},
+        {"all items again", [&] { model->ToggleOpenedItemsOnly(); }},
+        {"subtree moved", [&] { model->MoveItemTo(Item(inner), Item(target)); }},
+        {"renamed inside the moved subtree",
+         [&] {
+             Update(deep, {{u"title"_s, u"Moved"_s}});
+         }},
+        {"deleted",
+         [&] {
+             model->SelectById(folder);
+             model->DeleteSelected();
+         }},
+        {"removed for good", [&] { model->EmptyDeletedItems(); }},
+        {"rename after the removal",
+         [&] {
+             Update(other, {{u"title"_s, u"Last"_s}});
+         }},
+    };
+    for (const auto& [what, change] : changes) {
+        change();
+        tree->OnIdle();
+        WNavigatorTree fresh;
+        fresh.Rebuild();
+        EXPECT_EQ(Picture(*tree), Picture(fresh)) << what;
+        EXPECT_EQ(tree->currentItem()->text(0), fresh.currentItem()->text(0)) << what;
+    }
 }
 
 TEST_F(NavigatorTreeTest, OpenedItemsOnlyRemovesClosedItemsAtTheNextIdlePass) {
