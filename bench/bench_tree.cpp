@@ -45,15 +45,26 @@ std::unique_ptr<WNavigatorTree> ShownTree() {
     return tree;
 }
 
+// The idle pass's share of the tree, then the paint the user waits for.
+void IdlePassAndPaint(WNavigatorTree& tree) {
+    tree.OnIdle();
+    tree.repaint();
+    QApplication::processEvents();
+}
+
+// A shown tree that already holds the whole notebook.
+std::unique_ptr<WNavigatorTree> FilledTree(WNavDS* model) {
+    std::unique_ptr<WNavigatorTree> tree = ShownTree();
+    model->SetChanged(true);
+    IdlePassAndPaint(*tree);
+    return tree;
+}
+
 // From an empty window to the whole tree painted.
 void BM_TreeFirstWindow(benchmark::State& state) {
     WNavDS* model = ModelFor(Bench::PrepareCatalog(static_cast<int>(state.range(0))));
     for (auto _ : state) {
-        std::unique_ptr<WNavigatorTree> tree = ShownTree();
-        model->SetChanged(true);
-        tree->OnIdle();
-        tree->repaint();
-        QApplication::processEvents();
+        std::unique_ptr<WNavigatorTree> tree = FilledTree(model);
         state.PauseTiming();
         tree.reset();
         state.ResumeTiming();
@@ -66,10 +77,7 @@ void BM_TreeRebuildAfterChange(benchmark::State& state) {
     const Bench::GeneratedCatalog& catalog =
         Bench::PrepareCatalog(static_cast<int>(state.range(0)));
     WNavDS* model = ModelFor(catalog);
-    std::unique_ptr<WNavigatorTree> tree = ShownTree();
-    model->SetChanged(true);
-    tree->OnIdle();
-    QApplication::processEvents();
+    std::unique_ptr<WNavigatorTree> tree = FilledTree(model);
     const QString note = catalog.notes[catalog.notes.size() / 2];
     int turn = 0;
     for (auto _ : state) {
@@ -78,9 +86,7 @@ void BM_TreeRebuildAfterChange(benchmark::State& state) {
         set->SetProperty(QStringLiteral("title"), QStringLiteral("Title %1").arg(++turn));
         model->UpdateItem(note, set.get(), false);
         state.ResumeTiming();
-        tree->OnIdle();
-        tree->repaint();
-        QApplication::processEvents();
+        IdlePassAndPaint(*tree);
     }
     ReportPeakMemory(state);
 }
@@ -90,10 +96,7 @@ void BM_TreeRebuildAfterMove(benchmark::State& state) {
     const Bench::GeneratedCatalog& catalog =
         Bench::PrepareCatalog(static_cast<int>(state.range(0)));
     WNavDS* model = ModelFor(catalog);
-    std::unique_ptr<WNavigatorTree> tree = ShownTree();
-    model->SetChanged(true);
-    tree->OnIdle();
-    QApplication::processEvents();
+    std::unique_ptr<WNavigatorTree> tree = FilledTree(model);
     NavListItemData* folders[] = {model->FindItem(catalog.folders[0]),
                                   model->FindItem(catalog.folders[1])};
     NavListItemData* note = model->FindItem(catalog.notes[catalog.notes.size() / 3]);
@@ -102,9 +105,7 @@ void BM_TreeRebuildAfterMove(benchmark::State& state) {
         state.PauseTiming();
         model->MoveItemTo(note, folders[turn++ % 2]);
         state.ResumeTiming();
-        tree->OnIdle();
-        tree->repaint();
-        QApplication::processEvents();
+        IdlePassAndPaint(*tree);
     }
     ReportPeakMemory(state);
 }
