@@ -11,6 +11,7 @@
 #include "messaging/ActivityCenter.h"
 #include "navigator/ItemProperties.h"
 #include "navigator/WNavDS.h"
+#include "settings/CNavigatorSettingsDlg.h"
 #include "settings/NavigatorSettings.h"
 #include "ui/ModalDialog.h"
 
@@ -121,6 +122,10 @@ void CApplicationCommands::Register(CCommandRouter& router, std::function<QWidge
     router.Register({32778}, {[] { GetMailService()->TellAFriend(); },
                               [] { return GetMailService()->CanSendMail(); }, nullptr});
 
+    router.Register(
+        {32775},
+        {[mainWindow] { OpenSettingsDialog(mainWindow(), CNavigatorSettingsDlg::GeneralPage); },
+         nullptr, nullptr});
     router.Register({32793}, {[] { LaunchStartPanel(Options()->GetApplicationInfo()); },
                               [] { return Options()->GetApplicationInfo() != nullptr; }, nullptr});
     router.Register({32784}, {[] { LaunchActivityCenter(false); },

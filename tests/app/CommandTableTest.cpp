@@ -99,9 +99,8 @@ TEST_F(CommandTableTest, EveryCommandReachesItsOwnerOrIsDisabled) {
         {57670, u"root"_s, {}},
         {32776, u"root"_s, {}},
         {32862, u"root"_s, {}},
-        // Owners still to come: settings dialog, blog, updates, message archive; and "Save As
-        // MS Word", which nothing handles.
-        {32775, u"root"_s, {}},
+        // Owners still to come: blog, updates, message archive; and "Save As MS Word", which
+        // nothing handles.
         {32923, note, {}},
         {32924, u"root"_s, {}},
         {32851, u"root"_s, {}},

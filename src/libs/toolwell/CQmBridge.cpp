@@ -1,6 +1,7 @@
 #include "libs/toolwell/CQmBridge.h"
 
 #include "platform/IProcessLauncher.h"
+#include "platform/Registry.h"
 
 #include <QClipboard>
 #include <QDir>
@@ -44,6 +45,9 @@ QString PictureDocument(const QString& fileName) {
         QFileInfo(fileName).completeBaseName(),
         QStringLiteral("<p><img src=\"%1\" alt=\"%2\"></p>").arg(source, fileName.toHtmlEscaped()));
 }
+
+const QString kSendToChoiceValue = QStringLiteral("SendToChoice");
+constexpr int kChoices = 3;
 
 } // namespace
 
@@ -170,6 +174,21 @@ HRESULT CQmBridge::PasteClipboardToQm() {
     if (!written)
         return E_FAIL;
     return Open(processor, {document}, &handOver);
+}
+
+int CQmBridge::GetSendToChoice() {
+    bool valid = false;
+    const int choice =
+        Platform::Registry::UserValue(WordProcessor::KeyPath, kSendToChoiceValue).toInt(&valid);
+    return valid && choice >= 0 && choice < kChoices ? choice : 0;
+}
+
+HRESULT CQmBridge::SetSendToChoice(int choice) {
+    if (choice < 0 || choice >= kChoices)
+        return E_INVALIDARG;
+    return Platform::Registry::SetUserValue(WordProcessor::KeyPath, kSendToChoiceValue, choice)
+               ? S_OK
+               : E_FAIL;
 }
 
 IQmBridge* GetQmBridge() {

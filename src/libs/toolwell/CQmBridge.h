@@ -15,6 +15,8 @@ public:
     HRESULT SendDocumentToQm(const QString& path, const QString& target, bool inNotebook) override;
     HRESULT SendPictureToQm(const QString& picturePath, const QString& target) override;
     HRESULT PasteClipboardToQm() override;
+    int GetSendToChoice() override;
+    HRESULT SetSendToChoice(int choice) override;
     void Release() override { delete this; }
 
 private:

@@ -42,6 +42,11 @@ public:
     // Opens the clipboard's rich text, picture or plain text (the first there is) in the word
     // processor; E_FAIL when the clipboard holds none of them.
     virtual HRESULT PasteClipboardToQm() = 0;
+    // Where the user prefers items sent: 0 the product's word processor, 1 the other office
+    // word processor, 2 ask each time. Kept in the registry stand-in beside the command; 0 until
+    // the user chose. SetSendToChoice refuses anything else with E_INVALIDARG.
+    virtual int GetSendToChoice() = 0;
+    virtual HRESULT SetSendToChoice(int choice) = 0;
     virtual void Release() = 0;
 
 protected:
