@@ -16,8 +16,11 @@ StartPanelInstance::StartPanelInstance(CompanionBus& bus, QObject* parent)
     : QObject(parent), m_bus(bus) {}
 
 StartPanelInstance::~StartPanelInstance() {
+    QDBusConnection connection = m_bus.Connection();
+    if (m_claimed)
+        connection.unregisterService(AmbrelBus::kStartPanelName);
     if (m_registered)
-        m_bus.Connection().unregisterObject(kPath);
+        connection.unregisterObject(kPath);
 }
 
 bool StartPanelInstance::Claim() {
@@ -26,7 +29,8 @@ bool StartPanelInstance::Claim() {
     // The object comes first, so that a panel that finds the name taken can always reach it.
     QDBusConnection connection = m_bus.Connection();
     m_registered = connection.registerObject(kPath, this, QDBusConnection::ExportAllSlots);
-    if (m_registered && m_bus.RegisterName(AmbrelBus::kStartPanelName))
+    m_claimed = m_registered && m_bus.RegisterName(AmbrelBus::kStartPanelName);
+    if (m_claimed)
         return true;
     const QDBusMessage call = QDBusMessage::createMethodCall(
         AmbrelBus::kStartPanelName, kPath, kInterface, QStringLiteral("Activate"));

@@ -27,4 +27,5 @@ Q_SIGNALS:
 private:
     CompanionBus& m_bus;
     bool m_registered = false;
+    bool m_claimed = false;
 };

@@ -35,7 +35,9 @@ int RunStartPanel() {
     QObject::connect(&bus, &CompanionBus::WindowCommandReceived, &panel,
                      &CStartPanelDlg::ApplyWindowCommand);
     QObject::connect(&bus, &CompanionBus::NavigatorGone, &panel, &CStartPanelDlg::reject);
-    // Every way out (closed, Escape, told to close while hidden) finishes the dialog.
+    // Every way out (closed, Escape, told to close while hidden) finishes the dialog, and only
+    // that ends the program: a hidden or minimised panel stays.
+    QApplication::setQuitOnLastWindowClosed(false);
     QObject::connect(&panel, &CStartPanelDlg::finished, qApp, &QApplication::quit,
                      Qt::QueuedConnection);
     panel.show();
