@@ -11,6 +11,7 @@
 #include <QCoreApplication>
 #include <QDBusConnection>
 #include <QDBusConnectionInterface>
+#include <QDBusMetaType>
 #include <QElapsedTimer>
 #include <QEventLoop>
 #include <QFileDialog>
@@ -103,6 +104,8 @@ protected:
         if (!QDBusConnection::sessionBus().isConnected())
             GTEST_SKIP() << "no session bus";
         Platform::SetProcessLauncher(&launcher);
+        // The navigator's side registers the properties' type when it starts.
+        qDBusRegisterMetaType<Props>();
     }
     void TearDown() override {
         Platform::SetProcessLauncher(nullptr);
