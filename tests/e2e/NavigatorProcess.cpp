@@ -7,7 +7,8 @@
 
 #include <csignal>
 
-NavigatorProcess::NavigatorProcess(const QString& home) : m_home(home) {
+NavigatorProcess::NavigatorProcess(const QString& home, const QString& program)
+    : m_home(home), m_program(program) {
     m_process.setProcessEnvironment(Environment());
     m_process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
 }
@@ -31,7 +32,7 @@ QProcessEnvironment NavigatorProcess::Environment() const {
 
 void NavigatorProcess::Start(const QStringList& arguments) {
     m_startedAt = QDateTime::currentDateTime();
-    m_process.start(QStringLiteral(AMBREL_NAVIGATOR_PATH), arguments);
+    m_process.start(m_program, arguments);
 }
 
 QString NavigatorProcess::SettingsFile() const {
@@ -57,7 +58,7 @@ int NavigatorProcess::RunToEnd(const QStringList& arguments, int timeoutMs) {
     QProcess second;
     second.setProcessEnvironment(Environment());
     second.setProcessChannelMode(QProcess::ForwardedChannels);
-    second.start(QStringLiteral(AMBREL_NAVIGATOR_PATH), arguments);
+    second.start(m_program, arguments);
     if (!second.waitForFinished(timeoutMs)) {
         second.kill();
         second.waitForFinished();

@@ -9,7 +9,9 @@
 // test's temporary home.
 class NavigatorProcess {
 public:
-    explicit NavigatorProcess(const QString& home);
+    // program: the navigator to run; the built one unless told otherwise.
+    explicit NavigatorProcess(const QString& home,
+                              const QString& program = QStringLiteral(AMBREL_NAVIGATOR_PATH));
     ~NavigatorProcess();
 
     void Start(const QStringList& arguments = {});
@@ -28,6 +30,7 @@ public:
 
 private:
     QString m_home;
+    QString m_program;
     QProcess m_process;
     QDateTime m_startedAt;
 };

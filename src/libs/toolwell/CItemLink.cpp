@@ -2,6 +2,7 @@
 
 #include "platform/Registry.h"
 
+#include <QDateTime>
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
@@ -33,7 +34,8 @@ QList<ItemLinkEntry> CItemLink::Items() {
         // A damaged entry is dropped rather than offered.
         if (itemId.isEmpty() || IndexOf(entries, itemId) >= 0)
             continue;
-        entries.append({itemId, object.value(QLatin1StringView("title")).toString()});
+        entries.append({itemId, object.value(QLatin1StringView("title")).toString(),
+                        object.value(QLatin1StringView("used")).toInteger()});
     }
     return entries;
 }
@@ -42,7 +44,8 @@ bool CItemLink::Write(const QList<ItemLinkEntry>& entries) {
     QJsonArray array;
     for (const ItemLinkEntry& entry : entries) {
         array.append(QJsonObject{{QStringLiteral("itemid"), entry.itemId},
-                                 {QStringLiteral("title"), entry.title}});
+                                 {QStringLiteral("title"), entry.title},
+                                 {QStringLiteral("used"), entry.usedAt}});
     }
     const QString text = QString::fromUtf8(QJsonDocument(array).toJson(QJsonDocument::Compact));
     return Platform::Registry::SetUserValue(kKeyPath, m_valueName, text);
@@ -54,7 +57,7 @@ HRESULT CItemLink::AnnounceItem(const QString& itemId, const QString& title) {
     QList<ItemLinkEntry> entries = Items();
     if (const qsizetype at = IndexOf(entries, itemId); at >= 0)
         entries.removeAt(at);
-    entries.prepend({itemId, title});
+    entries.prepend({itemId, title, QDateTime::currentMSecsSinceEpoch()});
     while (entries.size() > MaxEntries)
         entries.removeLast();
     return Write(entries) ? S_OK : E_FAIL;

@@ -11,6 +11,9 @@ class IDataStoreHost;
 struct ItemLinkEntry {
     QString itemId;
     QString title;
+    // When it was last announced, in milliseconds since the epoch; 0 when not known. Lets a
+    // reader merge the lists of both kinds by recency.
+    qint64 usedAt = 0;
 };
 
 // The items of one kind that the product offers as recently used, most recent first.
