@@ -149,6 +149,8 @@ bool CNavigatorApp::StartUp() {
     settings->SetFrame(m_mainWindow);
 
     ConnectMessageBroker();
+    m_windows = std::make_unique<CNavigatorWindows>(m_mainWindow, &Platform::ForeignWindows());
+    Platform::SetForeignWindows(m_windows.get());
 
     // The window options are applied through their settings, which also shows them at once.
     settings->SetKeepOnTop(settings->GetKeepOnTop());
@@ -215,6 +217,10 @@ int CNavigatorApp::ExitInstance() {
         WNavDS::Instance()->EmptyDeletedItems();
     if (settings->IsDirty())
         settings->Save();
+    if (m_windows) {
+        Platform::SetForeignWindows(nullptr);
+        m_windows.reset();
+    }
     if (m_messageBroker) {
         m_messageBroker->Disconnect();
         m_messageBroker.reset();
@@ -297,7 +303,5 @@ HRESULT CNavigatorApp::SaveDocumentToNotebook(const QString& itemId) {
 HRESULT CNavigatorApp::ForEachWindow(IWindowCallback* callback) {
     if (callback == nullptr)
         return E_INVALIDARG;
-    const Platform::WindowHandle window =
-        m_mainWindow ? static_cast<Platform::WindowHandle>(m_mainWindow->winId()) : 0;
-    return callback->Apply(window, 0);
+    return callback->Apply(CNavigatorWindows::HandleOf(m_mainWindow), 0);
 }

@@ -10,6 +10,7 @@
 #include "libs/toolwell/IMessageBroker.h"
 #include "messaging/CNavInstanceMgr.h"
 #include "messaging/INavigatorService.h"
+#include "ui/CNavigatorWindows.h"
 #include "ui/WMainFrame.h"
 
 #include <QCoreApplication>
@@ -70,5 +71,8 @@ private:
     int m_exitCode = 0;
     CNavInstanceMgr m_instanceManager{this};
     ReleasePtr<IMessageBroker> m_messageBroker;
+    // The navigator's own window among the windows that requests act on; it relies on the
+    // broker's bus side underneath, so it goes before the broker.
+    std::unique_ptr<CNavigatorWindows> m_windows;
     bool m_firstIdle = true;
 };

@@ -1,0 +1,64 @@
+#include "ui/CNavigatorWindows.h"
+
+CNavigatorWindows::CNavigatorWindows(QWidget* ownWindow, Platform::IForeignWindows* others)
+    : m_ownWindow(ownWindow), m_ownHandle(HandleOf(ownWindow)), m_others(others) {}
+
+Platform::WindowHandle CNavigatorWindows::HandleOf(const QWidget* window) {
+    // The window system's id: the same number the navigator hands out for its window.
+    return window != nullptr ? static_cast<Platform::WindowHandle>(window->winId()) : 0;
+}
+
+QWidget* CNavigatorWindows::Own(Platform::WindowHandle window) const {
+    return window != 0 && window == m_ownHandle ? m_ownWindow.data() : nullptr;
+}
+
+bool CNavigatorWindows::IsWindow(Platform::WindowHandle window) {
+    return Own(window) != nullptr || m_others->IsWindow(window);
+}
+
+bool CNavigatorWindows::Show(Platform::WindowHandle window, int showCommand) {
+    QWidget* own = Own(window);
+    if (own == nullptr)
+        return m_others->Show(window, showCommand);
+    switch (showCommand) {
+    case Platform::ShowCommand::Hide:
+        own->hide();
+        break;
+    case Platform::ShowCommand::Minimize:
+        own->showMinimized();
+        break;
+    case Platform::ShowCommand::Maximize:
+        own->showMaximized();
+        break;
+    case Platform::ShowCommand::Restore:
+    case Platform::ShowCommand::ShowNormal:
+        own->showNormal();
+        break;
+    default:
+        own->show();
+        break;
+    }
+    return true;
+}
+
+bool CNavigatorWindows::Close(Platform::WindowHandle window) {
+    if (QWidget* own = Own(window))
+        return own->close();
+    return m_others->Close(window);
+}
+
+bool CNavigatorWindows::BringToFront(Platform::WindowHandle window) {
+    QWidget* own = Own(window);
+    if (own == nullptr)
+        return m_others->BringToFront(window);
+    own->raise();
+    return true;
+}
+
+bool CNavigatorWindows::Focus(Platform::WindowHandle window) {
+    QWidget* own = Own(window);
+    if (own == nullptr)
+        return m_others->Focus(window);
+    own->activateWindow();
+    return true;
+}
