@@ -88,9 +88,8 @@ bool CBlogAccountDlg::AcceptScheme(const QUrl& url) {
     if (url.scheme() == u"https"_s)
         return true;
     const QString host = url.host();
-    const bool agreedBefore =
-        m_account.value(kAllowHttp) == u"true"_s &&
-        Address(m_account.value(Postwick::kAccountXmlRpcUrl)).host() == host;
+    const bool agreedBefore = m_account.value(kAllowHttp) == u"true"_s &&
+                              Address(m_account.value(Postwick::kAccountXmlRpcUrl)).host() == host;
     if (agreedBefore)
         return true;
     const int answer = Platform::MessageBox().Show(
@@ -145,8 +144,7 @@ void CBlogAccountDlg::OnOk() {
 
 void CBlogAccountDlg::Check(const QString& password) {
     const QUrl url(m_account.value(Postwick::kAccountXmlRpcUrl));
-    const QVariantList params{QString(), m_account.value(Postwick::kAccountUser),
-                              password};
+    const QVariantList params{QString(), m_account.value(Postwick::kAccountUser), password};
     m_check = CXmlRpcCall::Start(
         m_network, url, u"blogger.getUsersBlogs"_s, params, m_timeoutMs, this,
         [this, password](const CXmlRpcCall::Result& result) {
@@ -161,12 +159,11 @@ void CBlogAccountDlg::Check(const QString& password) {
             const QUrl wanted(m_account.value(Postwick::kAccountBlogHost));
             for (const QVariant& entry : blogs) {
                 const QVariantMap blog = entry.toMap();
-                if (!wanted.isEmpty() && QUrl(blog.value(u"url"_s).toString())
-                                                 .matches(wanted, QUrl::StripTrailingSlash))
+                if (!wanted.isEmpty() &&
+                    QUrl(blog.value(u"url"_s).toString()).matches(wanted, QUrl::StripTrailingSlash))
                     chosen = blog;
             }
-            m_account.insert(Postwick::kAccountBlogId,
-                             chosen.value(u"blogid"_s).toString());
+            m_account.insert(Postwick::kAccountBlogId, chosen.value(u"blogid"_s).toString());
             if (wanted.isEmpty()) {
                 const QUrl address = Address(chosen.value(u"url"_s).toString());
                 m_account.insert(Postwick::kAccountBlogHost, address.toString());

@@ -71,9 +71,8 @@ HRESULT CBlogAccountManager::RunDialog(const Postwick::AccountProperties& accoun
         QPointer<CPasswordStore> passwords(m_passwords);
         dialog->SetAccount(account, [passwords, oldName](auto deliver) {
             if (passwords)
-                passwords->Read(oldName, [deliver](bool, const QString& password) {
-                    deliver(password);
-                });
+                passwords->Read(oldName,
+                                [deliver](bool, const QString& password) { deliver(password); });
         });
     }
     // The dialog may go with its parent while it runs.

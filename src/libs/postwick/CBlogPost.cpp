@@ -15,8 +15,8 @@ CBlogPost::CBlogPost(Postwick::AccountProperties account, QString title, CNoteFo
                      CPasswordStore* passwords, QNetworkAccessManager* network, int timeoutMs,
                      Done done, QObject* parent)
     : QObject(parent), m_account(std::move(account)), m_title(std::move(title)),
-      m_note(std::move(note)), m_passwords(passwords), m_network(network),
-      m_timeoutMs(timeoutMs), m_done(std::move(done)) {}
+      m_note(std::move(note)), m_passwords(passwords), m_network(network), m_timeoutMs(timeoutMs),
+      m_done(std::move(done)) {}
 
 QString CBlogPost::Value(const QString& key) const {
     return m_account.value(key);
@@ -74,17 +74,17 @@ void CBlogPost::Publish() {
         {u"title"_s, m_title},
         {u"description"_s, m_note.BodyWithAddresses(m_addresses)},
     };
-    CXmlRpcCall::Start(m_network, Endpoint(), u"metaWeblog.newPost"_s,
-                       {Value(Postwick::kAccountBlogId), Value(Postwick::kAccountUser),
-                        m_password, content, true},
-                       m_timeoutMs, this, [this](const CXmlRpcCall::Result& result) {
-                           const QString postId = result.value.toString();
-                           if (!result.ok)
-                               return Fail(result.error);
-                           if (postId.isEmpty())
-                               return Fail(u"The blog gave no post number back."_s);
-                           AskForLink(postId);
-                       });
+    CXmlRpcCall::Start(
+        m_network, Endpoint(), u"metaWeblog.newPost"_s,
+        {Value(Postwick::kAccountBlogId), Value(Postwick::kAccountUser), m_password, content, true},
+        m_timeoutMs, this, [this](const CXmlRpcCall::Result& result) {
+            const QString postId = result.value.toString();
+            if (!result.ok)
+                return Fail(result.error);
+            if (postId.isEmpty())
+                return Fail(u"The blog gave no post number back."_s);
+            AskForLink(postId);
+        });
 }
 
 void CBlogPost::AskForLink(const QString& postId) {
@@ -117,8 +117,8 @@ void CBlogPost::Succeed(const QString& link) {
     Postwick::PostResult result;
     result.posted = true;
     result.link = link;
-    result.message =
-        u"The note \"%1\" was posted to %2:\n%3"_s.arg(m_title, Value(Postwick::kAccountName), link);
+    result.message = u"The note \"%1\" was posted to %2:\n%3"_s.arg(
+        m_title, Value(Postwick::kAccountName), link);
     const Done done = std::move(m_done);
     deleteLater();
     done(result);

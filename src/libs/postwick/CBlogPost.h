@@ -25,8 +25,8 @@ public:
     static constexpr qint64 kMaxPictureSize = 16 * 1024 * 1024;
 
     CBlogPost(Postwick::AccountProperties account, QString title, CNoteForBlog note,
-              CPasswordStore* passwords, QNetworkAccessManager* network, int timeoutMs,
-              Done done, QObject* parent);
+              CPasswordStore* passwords, QNetworkAccessManager* network, int timeoutMs, Done done,
+              QObject* parent);
 
     void Start();
 

@@ -10,9 +10,9 @@ using namespace Qt::StringLiterals;
 namespace {
 
 // An <img> tag's source attribute, quoted either way: the prefix, the quote and the value.
-const QRegularExpression kPictureSource(
-    uR"((<img\b[^>]*?\bsrc\s*=\s*)(["'])(.*?)\2)"_s,
-    QRegularExpression::CaseInsensitiveOption | QRegularExpression::DotMatchesEverythingOption);
+const QRegularExpression kPictureSource(uR"((<img\b[^>]*?\bsrc\s*=\s*)(["'])(.*?)\2)"_s,
+                                        QRegularExpression::CaseInsensitiveOption |
+                                            QRegularExpression::DotMatchesEverythingOption);
 
 QString DecodeAttribute(QString text) {
     text.replace(u"&quot;"_s, u"\""_s).replace(u"&#39;"_s, u"'"_s);

@@ -25,8 +25,8 @@ HRESULT CPostwick::SetWorkingFolder(const QString& folder) {
     m_accounts.reset();
     delete m_passwords;
     m_passwords = new CPasswordStore(dir.filePath(kPasswordsFile), this);
-    m_accounts = std::make_unique<CBlogAccountManager>(dir.filePath(kAccountsFile),
-                                                       m_passwords, m_network, &m_timeoutMs);
+    m_accounts = std::make_unique<CBlogAccountManager>(dir.filePath(kAccountsFile), m_passwords,
+                                                       m_network, &m_timeoutMs);
     return S_OK;
 }
 

@@ -96,9 +96,10 @@ public:
 private:
     Response Fail(const QString& why) {
         Response response;
-        response.error = m_xml.hasError() ? u"The answer is not well-formed XML-RPC: %1"_s.arg(
-                                                m_xml.errorString())
-                                          : why;
+        response.error =
+            m_xml.hasError()
+                ? u"The answer is not well-formed XML-RPC: %1"_s.arg(m_xml.errorString())
+                : why;
         return response;
     }
 
@@ -131,9 +132,9 @@ private:
     QVariant Failed(const QString& why) {
         m_failed = true;
         if (m_error.isEmpty())
-            m_error = m_xml.hasError() ? u"The answer is not well-formed XML-RPC: %1"_s.arg(
-                                             m_xml.errorString())
-                                       : why;
+            m_error = m_xml.hasError()
+                          ? u"The answer is not well-formed XML-RPC: %1"_s.arg(m_xml.errorString())
+                          : why;
         return {};
     }
 
