@@ -8,6 +8,7 @@ packages=(
   qt6-base-dev qt6-base-dev-tools libqt6dbus6 libqt6network6 qt6-qpa-plugins
   qt6-svg-dev libqt6svg6
   libpugixml-dev
+  qtkeychain-qt6-dev
   googletest libgtest-dev libgmock-dev libbenchmark-dev
   dbus-daemon dbus-bin xdg-utils desktop-file-utils
   fonts-dejavu-core

@@ -4,6 +4,7 @@
 #include "app/SaveAsDocument.h"
 #include "app/SystemIntegration.h"
 #include "catalog/IDataStoreService.h"
+#include "libs/postwick/IPostwick.h"
 #include "libs/toolwell/IHarborUtils.h"
 #include "libs/toolwell/IHelpService.h"
 #include "libs/toolwell/IMailService.h"
@@ -140,6 +141,10 @@ void CApplicationCommands::Register(CCommandRouter& router, std::function<QWidge
         {&SendSelectedByMail,
          [] { return WNavDS::Instance()->CanPrintSelected() && GetMailService()->CanSendMail(); },
          nullptr});
+    // The blogging library is linked into the program, so the data source can always make it.
+    WNavDS::SetBlogServiceFactory(&GetPostwickInterface);
+    router.Register({32923}, {[] { WNavDS::Instance()->SendSelectedNoteToBlog(); },
+                              [] { return WNavDS::Instance()->CanBlogSelected(); }, nullptr});
     router.Register({32876},
                     {[mainWindow] { SaveSelectedDocumentAs(mainWindow()); },
                      [] {

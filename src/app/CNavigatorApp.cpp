@@ -12,6 +12,8 @@
 #include "messaging/ActivityCenter.h"
 #include "messaging/IWindowCallback.h"
 #include "navigator/WNavDS.h"
+#include "settings/CNavigatorBloggingSettingsDlg.h"
+#include "settings/CNavigatorSettingsDlg.h"
 #include "settings/NavigatorSettings.h"
 #include "ui/ModalDialog.h"
 #include "ui/QtMessageBox.h"
@@ -146,6 +148,11 @@ bool CNavigatorApp::StartUp() {
     });
 
     m_mainWindow->SetTrackPosition(true);
+    // The blogging side plugs into the settings dialog and the data source here, so neither of
+    // them depends on the blogging library.
+    CNavigatorSettingsDlg::SetBloggingPageFactory(&CreateBloggingSettingsPage);
+    navigator->SetOpenBloggingSettingsHook(
+        [this] { OpenSettingsDialog(m_mainWindow, CNavigatorSettingsDlg::BloggingPage); });
     settings->SetFrame(m_mainWindow);
 
     ConnectMessageBroker();
@@ -226,6 +233,7 @@ int CNavigatorApp::ExitInstance() {
         m_messageBroker.reset();
     }
     SetSnapshotNoteHandler({});
+    CNavigatorSettingsDlg::SetBloggingPageFactory({});
     WNavDS::DestroyInstance();
     if (m_dataStoreService != nullptr) {
         m_dataStoreService->Shutdown(1);

@@ -130,6 +130,13 @@ void CNavInstanceMgr::Dispatch(const QString& name, DataExchange::IProperties* p
         SaveDocumentToNotebook(properties);
     } else if (name == u"WindowShowNotification"_s) {
         ShowAllWindows(properties);
+    } else if (name == u"SendToBlog"_s) {
+        QString path;
+        QString title;
+        QString fileName;
+        if (Get(properties, u"path"_s, &path) && Get(properties, u"title"_s, &title) &&
+            Get(properties, u"filename"_s, &fileName))
+            navigator->SendFileToBlog(path, title, fileName);
     } else if (name == u"UpdateMetadata"_s) {
         UpdateMetadata(properties);
     } else if (name == u"OpenItemByItemID"_s) {

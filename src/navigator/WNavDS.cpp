@@ -1,5 +1,7 @@
 #include "navigator/WNavDS.h"
 
+#include "libs/postwick/IPostwick.h"
+
 #include "app/ApplicationInfo.h"
 #include "catalog/IDataStoreService.h"
 #include "common/ReleasePtr.h"
@@ -72,6 +74,8 @@ void WNavDS::DestroyInstance() {
 
 WNavDS::~WNavDS() {
     Clear();
+    if (m_blogService != nullptr)
+        m_blogService->Release();
     if (m_noteToolService != nullptr)
         m_noteToolService->Release();
     if (m_viewerService != nullptr)

@@ -16,6 +16,7 @@
 
 class IDataStoreHost;
 class IDataStoreService;
+class IPostwick;
 class INoteToolService;
 class IViewerService;
 
@@ -282,7 +283,21 @@ public:
     // The note files below the folder that the filter shows, depth-first in catalog order,
     // deleted notes left out.
     void CollectNotePaths(const QString& folderId, QStringList* list);
+    // Posts the selected note (outside Deleted Items and Linked Documents) to the default blog
+    // account without waiting: the wait cursor shows until the blog answered, then a message
+    // says where the post is or why it failed. Without a default account the settings open on
+    // the Blogging page.
     void SendSelectedNoteToBlog();
+    // The same for a note file that another program names: `fileName` in the folder `path`.
+    void SendFileToBlog(const QString& path, const QString& title, const QString& fileName);
+    // The blogging interface, made on first use with the application data folder; null when
+    // the program has no blogging library.
+    IPostwick* GetBlogService();
+    // How the program makes its blogging interface; none means no blogging library.
+    static void SetBlogServiceFactory(std::function<IPostwick*()> factory);
+    // Opens the settings dialog on its Blogging page: what happens when a post finds no default
+    // account.
+    void SetOpenBloggingSettingsHook(std::function<void()> hook);
     // How long shut-down waits for each program's windows to close.
     static constexpr std::chrono::milliseconds kWindowCloseWait{8000};
     // Asks every note tool and viewer window to close and waits for them, up to `wait` for
@@ -296,8 +311,12 @@ public:
 
 private:
     void CloseAllOpen(ItemKind kind);
+    void PostToBlog(const QString& title, const QString& notePath);
     // The note's file as the note tool knows it; empty when none can be made.
     QString NoteFilePath(const QString& itemId) const;
 
     std::function<void()> m_idlePassHook;
+    std::function<void()> m_openBloggingSettings;
+    IPostwick* m_blogService = nullptr;
+    bool m_blogServiceTried = false;
 };

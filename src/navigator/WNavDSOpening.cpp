@@ -5,6 +5,7 @@
 #include "common/StringTable.h"
 #include "dataexchange/IDataStoreReporter.h"
 #include "dataexchange/WProperties.h"
+#include "libs/postwick/IPostwick.h"
 #include "libs/toolwell/IItemLink.h"
 #include "libs/toolwell/IQmBridge.h"
 #include "libs/toolwell/ItemIdentifier.h"
@@ -13,17 +14,20 @@
 #include "messaging/IViewerService.h"
 #include "messaging/IWindowService.h"
 #include "navigator/ItemProperties.h"
+#include "platform/AppFolders.h"
 #include "platform/IMessageBox.h"
 #include "platform/IWaitCursor.h"
 
 #include <QCoreApplication>
 #include <QDeadlineTimer>
+#include <QDir>
 #include <QFileInfo>
 #include <QThread>
 
 namespace {
 
 using namespace ItemProperties;
+using namespace Qt::StringLiterals;
 
 // The bridge asks nothing of the user when it connects, so it needs no owner window.
 constexpr Platform::WindowHandle kNoOwnerWindow = 0;
@@ -66,6 +70,11 @@ QList<NavListItemData*> Walk(const WNavDS& model, const QString& folderId,
         service != nullptr && !folderId.isEmpty())
         service->ReportDescendants(folderId, &walk);
     return walk.Records();
+}
+
+std::function<IPostwick*()>& BlogServiceFactory() {
+    static std::function<IPostwick*()> factory;
+    return factory;
 }
 
 bool IsFolder(const NavListItemData* record) {
@@ -330,9 +339,78 @@ void WNavDS::CollectNotePaths(const QString& folderId, QStringList* list) {
     }
 }
 
+void WNavDS::SetBlogServiceFactory(std::function<IPostwick*()> factory) {
+    BlogServiceFactory() = std::move(factory);
+}
+
+void WNavDS::SetOpenBloggingSettingsHook(std::function<void()> hook) {
+    m_openBloggingSettings = std::move(hook);
+}
+
+IPostwick* WNavDS::GetBlogService() {
+    if (m_blogService == nullptr && !m_blogServiceTried && BlogServiceFactory()) {
+        m_blogServiceTried = true;
+        m_blogService = BlogServiceFactory()();
+        if (m_blogService != nullptr &&
+            FAILED(m_blogService->SetWorkingFolder(Platform::ApplicationDataFolder() + u'/'))) {
+            m_blogService->Release();
+            m_blogService = nullptr;
+        }
+    }
+    return m_blogService;
+}
+
 void WNavDS::SendSelectedNoteToBlog() {
-    // Posting needs the blogging library's interface, and the program has no blogging library
-    // yet: there is nothing to post to, so the command does nothing.
+    if (!CanBlogSelected() || m_selected->GetItemId().isEmpty())
+        return;
+    const QString itemId = m_selected->GetItemId();
+    const PropertiesPtr properties = CatalogProperties(itemId);
+    QString path;
+    ResolveDocumentPath(itemId, properties.get(), &path);
+    PostToBlog(Property(properties.get(), QStringLiteral("title")), path);
+}
+
+void WNavDS::SendFileToBlog(const QString& path, const QString& title, const QString& fileName) {
+    // Only a plain file name in a folder named by its whole path.
+    const QFileInfo folder(path);
+    if (!folder.isAbsolute() || !folder.isDir() || fileName.isEmpty() || fileName.contains(u'/') ||
+        fileName == u"." || fileName == u"..")
+        return;
+    const QFileInfo file(QDir(path).filePath(fileName));
+    if (file.isFile())
+        PostToBlog(title, file.absoluteFilePath());
+}
+
+void WNavDS::PostToBlog(const QString& title, const QString& notePath) {
+    IPostwick* blog = GetBlogService();
+    if (blog == nullptr || title.isEmpty() || notePath.isEmpty())
+        return;
+    // The cursor waits with the post: it ends when the post reports, or when the library
+    // drops a post it could not finish.
+    auto waitCursor = std::make_shared<Platform::WaitCursorScope>();
+    const HRESULT started =
+        blog->PostNote(title, notePath, [waitCursor](const Postwick::PostResult& result) mutable {
+            waitCursor.reset();
+            Platform::MessageBox().Show(result.message, LoadString(StringId::ProductName),
+                                        result.posted ? Platform::MessageBoxStyle::IconInformation
+                                                      : Platform::MessageBoxStyle::IconWarning);
+        });
+    if (started == S_FALSE) {
+        waitCursor.reset();
+        if (m_openBloggingSettings) {
+            m_openBloggingSettings();
+        } else {
+            Platform::MessageBox().Show(
+                u"There is no default blog account. Add one on the Blogging page of the "
+                u"settings."_s,
+                LoadString(StringId::ProductName), Platform::MessageBoxStyle::IconInformation);
+        }
+    } else if (FAILED(started)) {
+        waitCursor.reset();
+        Platform::MessageBox().Show(LoadString(StringId::ActionFailed),
+                                    LoadString(StringId::ProductName),
+                                    Platform::MessageBoxStyle::IconWarning);
+    }
 }
 
 void WNavDS::SetIdlePassHook(std::function<void()> hook) {
