@@ -88,6 +88,7 @@ bool CNoteToolApp::Start() {
     m_window = std::make_unique<CNoteWindow>();
     m_window->SetNoteTitle(m_content.title);
     m_window->Editor()->ShowNote(m_content, m_file.Path());
+    m_window->ShowCurrentFormat();
     if (m_fileState == CNoteFile::State::Unreadable)
         m_window->SetReadOnly(tr("This note's file cannot be read; it is shown read-only and "
                                  "never written over."));

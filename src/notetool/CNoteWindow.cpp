@@ -16,6 +16,9 @@
 #include <QToolBar>
 #include <QVBoxLayout>
 
+#include <array>
+#include <utility>
+
 namespace {
 
 QAction* AddCommand(QToolBar* bar, const QString& icon, const QString& text,
@@ -56,92 +59,117 @@ CNoteWindow::CNoteWindow(QWidget* parent) : QMainWindow(parent) {
 }
 
 void CNoteWindow::BuildToolBar() {
-    QToolBar* bar = addToolBar(tr("Format"));
-    bar->setObjectName(QStringLiteral("format"));
-    bar->setAccessibleName(tr("Format"));
-    bar->setMovable(false);
-
+    QToolBar* file = addToolBar(tr("Note"));
+    file->setObjectName(QStringLiteral("note"));
     QAction* save =
-        AddCommand(bar, QStringLiteral("document-save"), tr("Save"), QKeySequence::Save);
+        AddCommand(file, QStringLiteral("document-save"), tr("Save"), QKeySequence::Save);
     connect(save, &QAction::triggered, this, &CNoteWindow::SaveRequested);
     QAction* print =
-        AddCommand(bar, QStringLiteral("document-print"), tr("Print"), QKeySequence::Print);
+        AddCommand(file, QStringLiteral("document-print"), tr("Print"), QKeySequence::Print);
     connect(print, &QAction::triggered, this, &CNoteWindow::PrintRequested);
-    bar->addSeparator();
-    QAction* undo = AddCommand(bar, QStringLiteral("edit-undo"), tr("Undo"), QKeySequence::Undo);
-    QAction* redo = AddCommand(bar, QStringLiteral("edit-redo"), tr("Redo"), QKeySequence::Redo);
+    file->addSeparator();
+    QAction* undo = AddCommand(file, QStringLiteral("edit-undo"), tr("Undo"), QKeySequence::Undo);
+    QAction* redo = AddCommand(file, QStringLiteral("edit-redo"), tr("Redo"), QKeySequence::Redo);
     undo->setEnabled(false);
     redo->setEnabled(false);
     connect(undo, &QAction::triggered, m_editor, &QTextEdit::undo);
     connect(redo, &QAction::triggered, m_editor, &QTextEdit::redo);
     connect(m_editor, &QTextEdit::undoAvailable, undo, &QAction::setEnabled);
     connect(m_editor, &QTextEdit::redoAvailable, redo, &QAction::setEnabled);
-    bar->addSeparator();
+    file->addSeparator();
+    QAction* picture = AddCommand(file, QStringLiteral("insert-image"), tr("Insert picture"));
+    connect(picture, &QAction::triggered, this, &CNoteWindow::ChoosePicture);
 
-    m_font = new QFontComboBox(bar);
+    addToolBarBreak();
+    QToolBar* format = addToolBar(tr("Format"));
+    format->setObjectName(QStringLiteral("format"));
+    m_font = new QFontComboBox(format);
     m_font->setAccessibleName(tr("Font"));
-    m_font->setMaximumWidth(160);
-    bar->addWidget(m_font);
+    m_font->setMaximumWidth(170);
+    format->addWidget(m_font);
     connect(m_font, &QFontComboBox::textActivated, this, [this](const QString& family) {
-        QTextCharFormat format;
-        format.setFontFamilies({family});
-        MergeFormat(format);
+        QTextCharFormat change;
+        change.setFontFamilies({family});
+        MergeFormat(change);
     });
-    m_size = new QComboBox(bar);
+    m_size = new QComboBox(format);
     m_size->setAccessibleName(tr("Font size"));
     m_size->setEditable(true);
     for (const int size : QFontDatabase::standardSizes())
         m_size->addItem(QString::number(size));
-    bar->addWidget(m_size);
+    format->addWidget(m_size);
     connect(m_size, &QComboBox::textActivated, this, [this](const QString& text) {
         const double size = text.toDouble();
         if (size <= 0 || size > 400)
             return;
-        QTextCharFormat format;
-        format.setFontPointSize(size);
-        MergeFormat(format);
+        QTextCharFormat change;
+        change.setFontPointSize(size);
+        MergeFormat(change);
     });
 
-    m_bold = AddCommand(bar, QStringLiteral("format-text-bold"), tr("Bold"), QKeySequence::Bold);
-    m_italic =
-        AddCommand(bar, QStringLiteral("format-text-italic"), tr("Italic"), QKeySequence::Italic);
-    m_underline = AddCommand(bar, QStringLiteral("format-text-underline"), tr("Underline"),
+    m_bold = AddCommand(format, QStringLiteral("format-text-bold"), tr("Bold"), QKeySequence::Bold);
+    m_italic = AddCommand(format, QStringLiteral("format-text-italic"), tr("Italic"),
+                          QKeySequence::Italic);
+    m_underline = AddCommand(format, QStringLiteral("format-text-underline"), tr("Underline"),
                              QKeySequence::Underline);
     for (QAction* toggle : {m_bold, m_italic, m_underline})
         toggle->setCheckable(true);
     connect(m_bold, &QAction::triggered, this, [this](bool on) {
-        QTextCharFormat format;
-        format.setFontWeight(on ? QFont::Bold : QFont::Normal);
-        MergeFormat(format);
+        QTextCharFormat change;
+        change.setFontWeight(on ? QFont::Bold : QFont::Normal);
+        MergeFormat(change);
     });
     connect(m_italic, &QAction::triggered, this, [this](bool on) {
-        QTextCharFormat format;
-        format.setFontItalic(on);
-        MergeFormat(format);
+        QTextCharFormat change;
+        change.setFontItalic(on);
+        MergeFormat(change);
     });
     connect(m_underline, &QAction::triggered, this, [this](bool on) {
-        QTextCharFormat format;
-        format.setFontUnderline(on);
-        MergeFormat(format);
+        QTextCharFormat change;
+        change.setFontUnderline(on);
+        MergeFormat(change);
     });
-    QAction* color = AddCommand(bar, QStringLiteral("format-text-color"), tr("Text colour"));
+    QAction* color = AddCommand(format, QStringLiteral("format-text-color"), tr("Text colour"));
     connect(color, &QAction::triggered, this, &CNoteWindow::ChooseColor);
-    bar->addSeparator();
+    format->addSeparator();
     QAction* bullets =
-        AddCommand(bar, QStringLiteral("format-list-unordered"), tr("Bulleted list"));
+        AddCommand(format, QStringLiteral("format-list-unordered"), tr("Bulleted list"));
     connect(bullets, &QAction::triggered, this, [this] { ToggleList(QTextListFormat::ListDisc); });
-    QAction* numbers = AddCommand(bar, QStringLiteral("format-list-ordered"), tr("Numbered list"));
+    QAction* numbers =
+        AddCommand(format, QStringLiteral("format-list-ordered"), tr("Numbered list"));
     connect(numbers, &QAction::triggered, this,
             [this] { ToggleList(QTextListFormat::ListDecimal); });
-    QAction* picture = AddCommand(bar, QStringLiteral("insert-image"), tr("Insert picture"));
-    connect(picture, &QAction::triggered, this, &CNoteWindow::ChoosePicture);
 
-    const QList<QAction*> commands = bar->actions();
-    for (QAction* command : commands) {
-        // Buttons without a picture in the desktop's theme show their word instead.
-        if (QWidget* button = bar->widgetForAction(command); button && !command->isSeparator())
-            button->setAccessibleName(command->text());
+    // Without the desktop's pictures the styles show as letters in their own style.
+    const std::array<std::pair<QAction*, QString>, 6> shortWords{{{m_bold, tr("B")},
+                                                                  {m_italic, tr("I")},
+                                                                  {m_underline, tr("U")},
+                                                                  {color, tr("Colour")},
+                                                                  {bullets, tr("\u2022 List")},
+                                                                  {numbers, tr("1. List")}}};
+    for (const auto& [action, word] : shortWords) {
+        if (action->icon().isNull())
+            action->setIconText(word);
     }
+    for (QToolBar* bar : {file, format}) {
+        bar->setMovable(false);
+        bar->setAccessibleName(bar->windowTitle());
+        const QList<QAction*> commands = bar->actions();
+        for (QAction* command : commands) {
+            if (QWidget* button = bar->widgetForAction(command); button && !command->isSeparator())
+                button->setAccessibleName(command->text());
+        }
+    }
+    const auto styleButton = [format](QAction* action, auto change) {
+        if (QWidget* button = format->widgetForAction(action); action->icon().isNull()) {
+            QFont font = button->font();
+            change(font);
+            button->setFont(font);
+        }
+    };
+    styleButton(m_bold, [](QFont& font) { font.setBold(true); });
+    styleButton(m_italic, [](QFont& font) { font.setItalic(true); });
+    styleButton(m_underline, [](QFont& font) { font.setUnderline(true); });
 }
 
 QString CNoteWindow::NoteTitle() const {
@@ -165,11 +193,16 @@ void CNoteWindow::ShowMessage(const QString& message) {
     statusBar()->showMessage(message);
 }
 
+void CNoteWindow::ShowCurrentFormat() {
+    ShowFormat(m_editor->currentCharFormat());
+}
+
 void CNoteWindow::ShowFormat(const QTextCharFormat& format) {
     m_bold->setChecked(format.fontWeight() >= QFont::Bold);
     m_italic->setChecked(format.fontItalic());
     m_underline->setChecked(format.fontUnderline());
-    const QFont font = format.font();
+    // The format names only what differs from the note's own font.
+    const QFont font = format.font().resolve(m_editor->document()->defaultFont());
     m_font->setCurrentFont(font);
     m_size->setEditText(QString::number(font.pointSizeF()));
 }

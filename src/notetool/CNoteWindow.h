@@ -23,6 +23,8 @@ public:
     // Stops every edit: for a note whose file could not be read.
     void SetReadOnly(const QString& reason);
     void ShowMessage(const QString& message);
+    // The format commands show the style at the cursor (after the note was loaded).
+    void ShowCurrentFormat();
 
 Q_SIGNALS:
     void Activated();
