@@ -195,6 +195,7 @@ void CNoteToolApp::OnCloseRequested(bool* allowed) {
     if (m_bus->IsConnected())
         m_bus->IsNavigatorRunning();
     m_closed = true;
+    Q_EMIT Closed();
 }
 
 void CNoteToolApp::Post(const QString& name, QMap<QString, QString> properties) {

@@ -39,14 +39,18 @@ public:
     CNoteWindow* Window() const { return m_window.get(); }
     CNoteFile::State FileState() const { return m_fileState; }
     bool IsChanged() const;
-    // Writes the note when it can be written; tells the navigator its title and the time.
-    bool Save();
-
 public Q_SLOTS:
-    // What the note's bus name offers: bring the window forward, rename the note, close it.
+    // What the note's bus name offers: bring the window forward, rename the note, save it,
+    // close it.
     Q_SCRIPTABLE void Activate();
     Q_SCRIPTABLE void SetTitle(const QString& title);
+    // Writes the note when it can be written; tells the navigator its title and the time.
+    Q_SCRIPTABLE bool Save();
     Q_SCRIPTABLE void Close();
+
+Q_SIGNALS:
+    // The window has closed and the navigator has been told: the program may end.
+    void Closed();
 
 private:
     void ApplyProperties(const QMap<QString, QString>& properties, bool fromNavigator);

@@ -20,6 +20,8 @@ int main(int argc, char* argv[]) {
     CNoteToolApp note(&bus, commandLine.NotePath(), commandLine.Properties());
     if (!note.Start())
         return 0;
+    QObject::connect(&note, &CNoteToolApp::Closed, &application, &QApplication::quit,
+                     Qt::QueuedConnection);
     // Ending the session closes the note as its window's close button does: saved first.
     const TerminationSignals termination;
     QObject::connect(&termination, &TerminationSignals::Received, &note, &CNoteToolApp::Close);
