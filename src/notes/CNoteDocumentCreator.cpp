@@ -104,14 +104,18 @@ QString CNoteDocumentCreator::DocumentText() {
     return text;
 }
 
-HRESULT CNoteDocumentCreator::Write() {
+QByteArray CNoteDocumentCreator::FileBytes() {
     QString document = DocumentText();
     // The text ends at its first zero character, as other writers of note files do.
     const qsizetype end = document.indexOf(QChar(u'\0'));
     if (end >= 0)
         document.truncate(end);
     // Readers of note files expect the terminating zero byte inside the file.
-    const QByteArray bytes = document.toUtf8() + '\0';
+    return document.toUtf8() + '\0';
+}
+
+HRESULT CNoteDocumentCreator::Write() {
+    const QByteArray bytes = FileBytes();
 
     // A note file is never written over: an existing file stays as it is.
     QFile file(m_filePath);

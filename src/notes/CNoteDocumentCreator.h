@@ -21,6 +21,9 @@ public:
     HRESULT Write() override;
     unsigned long Release() override;
 
+    // The bytes of the note file as Write makes them: the UTF-8 document and one zero byte.
+    QByteArray FileBytes();
+
 private:
     QString DocumentText();
 
