@@ -104,7 +104,8 @@ CViewerWindow::CViewerWindow(QWidget* parent)
     connect(m_pdf, &CPdfPane::PageChanged, this, &CViewerWindow::UpdatePageLabel);
     connect(m_details, &CFileDetailsPane::SendToWordProcessorRequested, this,
             &CViewerWindow::SendToWordProcessorRequested);
-    resize(820, 900);
+    // Wide enough for an A4 page at the first zoom without a sideways scroll bar.
+    resize(860, 900);
     ShowMessage(QString());
 }
 
