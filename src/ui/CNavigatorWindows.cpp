@@ -1,15 +1,10 @@
 #include "ui/CNavigatorWindows.h"
 
 CNavigatorWindows::CNavigatorWindows(QWidget* ownWindow, Platform::IForeignWindows* others)
-    : m_ownWindow(ownWindow), m_ownHandle(HandleOf(ownWindow)), m_others(others) {}
-
-Platform::WindowHandle CNavigatorWindows::HandleOf(const QWidget* window) {
-    // The window system's id: the same number the navigator hands out for its window.
-    return window != nullptr ? static_cast<Platform::WindowHandle>(window->winId()) : 0;
-}
+    : m_ownWindow(ownWindow), m_others(others) {}
 
 QWidget* CNavigatorWindows::Own(Platform::WindowHandle window) const {
-    return window != 0 && window == m_ownHandle ? m_ownWindow.data() : nullptr;
+    return window == kOwnWindow ? m_ownWindow.data() : nullptr;
 }
 
 bool CNavigatorWindows::IsWindow(Platform::WindowHandle window) {

@@ -12,8 +12,12 @@ class CNavigatorWindows final : public Platform::IForeignWindows {
 public:
     CNavigatorWindows(QWidget* ownWindow, Platform::IForeignWindows* others);
 
-    // The number under which the navigator reports its own window.
-    static Platform::WindowHandle HandleOf(const QWidget* window);
+    // The number under which the navigator names its own window. The other programs' windows
+    // are numbered from 1 up, so the own window takes one that none of them can have.
+    static constexpr Platform::WindowHandle kOwnWindow = -1;
+    static Platform::WindowHandle HandleOf(const QWidget* window) {
+        return window != nullptr ? kOwnWindow : 0;
+    }
 
     bool IsWindow(Platform::WindowHandle window) override;
     bool Show(Platform::WindowHandle window, int showCommand) override;
@@ -27,6 +31,5 @@ private:
     QWidget* Own(Platform::WindowHandle window) const;
 
     QPointer<QWidget> m_ownWindow;
-    Platform::WindowHandle m_ownHandle;
     Platform::IForeignWindows* m_others;
 };

@@ -21,6 +21,12 @@ CViewerSession::CViewerSession(CompanionBus* bus, CViewerWindow* window, QString
             {{kItemId, m_itemId}, {QStringLiteral("event"), QStringLiteral("WindowOnActivate")}});
     });
     connect(m_window, &CViewerWindow::Closed, this, &CViewerSession::ReportClosed);
+    // A viewer that still waits for the navigator's document has nothing left to show once the
+    // navigator has gone; one that shows a file stays for the user.
+    connect(m_bus, &CompanionBus::NavigatorGone, this, [this] {
+        if (m_window != nullptr && !m_showsFile)
+            m_window->close();
+    });
     connect(m_window, &CViewerWindow::SendToWordProcessorRequested, this, [this] {
         m_bus->Post(QStringLiteral("RequestExportToQm"), {{kItemId, m_itemId}});
     });
@@ -135,6 +141,7 @@ void CViewerSession::OnFileChosen(const QString& path) {
 }
 
 void CViewerSession::ShowFile(const QString& path) {
+    m_showsFile = true;
     m_window->ShowFile(path);
     ReportOpen();
 }

@@ -44,4 +44,5 @@ private:
     QPointer<QFileDialog> m_fileDialog;
     QString m_itemId;
     bool m_closeReported = false;
+    bool m_showsFile = false;
 };

@@ -2,15 +2,19 @@
 
 #include <QDateTime>
 #include <QDeadlineTimer>
+#include <QFile>
 #include <QFileInfo>
 #include <QThread>
 
 #include <csignal>
+#include <cstdio>
 
 NavigatorProcess::NavigatorProcess(const QString& home, const QString& program)
     : m_home(home), m_program(program) {
     m_process.setProcessEnvironment(Environment());
-    m_process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
+    // The programs the navigator starts inherit its error output: a file, so that one left
+    // running never holds the test runner's pipe open.
+    m_process.setStandardErrorFile(ErrorFile());
 }
 
 NavigatorProcess::~NavigatorProcess() {
@@ -18,6 +22,13 @@ NavigatorProcess::~NavigatorProcess() {
         m_process.kill();
         m_process.waitForFinished(5000);
     }
+    QFile errors(ErrorFile());
+    if (errors.open(QIODevice::ReadOnly) && errors.size() > 0)
+        std::fputs(errors.readAll().constData(), stderr);
+}
+
+QString NavigatorProcess::ErrorFile() const {
+    return m_home + QStringLiteral("/navigator-errors.txt");
 }
 
 QProcessEnvironment NavigatorProcess::Environment() const {
@@ -57,13 +68,18 @@ bool NavigatorProcess::WaitUntilRunning(int timeoutMs) {
 int NavigatorProcess::RunToEnd(const QStringList& arguments, int timeoutMs) {
     QProcess second;
     second.setProcessEnvironment(Environment());
-    second.setProcessChannelMode(QProcess::ForwardedChannels);
+    // Read here rather than forwarded: a start that became the navigator starts programs that
+    // would otherwise hold the test runner's output open.
+    second.setProcessChannelMode(QProcess::MergedChannels);
     second.start(m_program, arguments);
-    if (!second.waitForFinished(timeoutMs)) {
+    const bool finished = second.waitForFinished(timeoutMs);
+    if (!finished) {
         second.kill();
         second.waitForFinished();
-        return -1;
     }
+    std::fputs(second.readAll().constData(), stderr);
+    if (!finished)
+        return -1;
     return second.exitStatus() == QProcess::NormalExit ? second.exitCode() : -1;
 }
 

@@ -29,6 +29,8 @@ public:
     QProcessEnvironment Environment() const;
 
 private:
+    QString ErrorFile() const;
+
     QString m_home;
     QString m_program;
     QProcess m_process;
