@@ -1,5 +1,6 @@
 #include "companion/CompanionBus.h"
 #include "support/AmbrelTest.h"
+#include "support/FakeNavigatorBroker.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>
@@ -12,64 +13,8 @@
 namespace {
 
 using Props = QMap<QString, QString>;
+using FakeNavigator = FakeNavigatorBroker;
 using namespace Qt::StringLiterals;
-
-const QString kService = u"com.brindle.QuillmarkAmbrel.AmbrelService"_s;
-const QString kPath = u"/AmbrelService"_s;
-const QString kBroker = u"com.brindle.QuillmarkAmbrel.Broker"_s;
-
-// Runs the event loop until done() holds or five seconds have passed.
-bool WaitFor(const std::function<bool()>& done) {
-    QElapsedTimer clock;
-    clock.start();
-    while (!done() && clock.elapsed() < 5000) {
-        QEventLoop loop;
-        QTimer::singleShot(10, &loop, &QEventLoop::quit);
-        loop.exec();
-    }
-    return done();
-}
-
-// The navigator's broker as a companion meets it: records what is posted, and notifies.
-class FakeNavigator final : public QObject {
-    Q_OBJECT
-    Q_CLASSINFO("D-Bus Interface", "com.brindle.QuillmarkAmbrel.Broker")
-public:
-    FakeNavigator() : bus(QDBusConnection::connectToBus(QDBusConnection::SessionBus, kName)) {
-        bus.registerObject(kPath, this, QDBusConnection::ExportAllSlots);
-        registered = bus.registerService(kService);
-    }
-    ~FakeNavigator() override { Leave(); }
-
-    void Leave() {
-        if (!bus.isConnected())
-            return;
-        bus.unregisterService(kService);
-        bus.unregisterObject(kPath);
-        bus = QDBusConnection(QString());
-        QDBusConnection::disconnectFromBus(kName);
-    }
-    void Notify(const QString& destination, const QString& name, const Props& properties) {
-        QDBusMessage signal =
-            destination.isEmpty()
-                ? QDBusMessage::createSignal(kPath, kBroker, u"Notify"_s)
-                : QDBusMessage::createTargetedSignal(destination, kPath, kBroker, u"Notify"_s);
-        signal << name << QVariant::fromValue(properties);
-        bus.send(signal);
-    }
-
-    bool registered = false;
-    QList<std::pair<QString, Props>> posted;
-    QDBusConnection bus;
-
-public Q_SLOTS:
-    void Post(const QString& name, const QMap<QString, QString>& properties) {
-        posted.append({name, properties});
-    }
-
-private:
-    static inline const QString kName = u"fake-navigator"_s;
-};
 
 class CompanionBusTest : public AmbrelTest {
 protected:
@@ -107,7 +52,7 @@ TEST_F(CompanionBusTest, PostsReachTheNavigatorInOrderAndOnlyOwnWindowCommandsAr
     const Props opened{{u"itemid"_s, u"A"_s}, {u"openwindowhandle"_s, u"1"_s}};
     EXPECT_TRUE(companion.Post(u"NoteOpenNotification"_s, opened));
     EXPECT_TRUE(companion.Post(u"UpdateMetadata"_s, {{u"open"_s, u"false"_s}}));
-    ASSERT_TRUE(WaitFor([&] { return navigator.posted.size() == 2; }));
+    ASSERT_TRUE(WaitForEvents([&] { return navigator.posted.size() == 2; }));
     EXPECT_EQ(navigator.posted[0], std::make_pair(u"NoteOpenNotification"_s, opened));
     EXPECT_EQ(navigator.posted[1].first, u"UpdateMetadata"_s);
 
@@ -120,7 +65,7 @@ TEST_F(CompanionBusTest, PostsReachTheNavigatorInOrderAndOnlyOwnWindowCommandsAr
     navigator.Notify(companion.UniqueName(), u"WindowCommand"_s,
                      {{u"handle"_s, u"1"_s}, {u"command"_s, u"close"_s}});
     navigator.Notify({}, u"ActivateNote"_s, {{u"itemid"_s, u"A"_s}});
-    ASSERT_TRUE(WaitFor([&] { return commands.size() == 2 && notes.size() == 1; }));
+    ASSERT_TRUE(WaitForEvents([&] { return commands.size() == 2 && notes.size() == 1; }));
     EXPECT_EQ(commands[0], std::make_tuple(qint64{1}, u"show"_s, 6));
     EXPECT_EQ(commands[1], std::make_tuple(qint64{1}, u"close"_s, -1));
     EXPECT_EQ(notes[0], std::make_pair(u"ActivateNote"_s, Props{{u"itemid"_s, u"A"_s}}));
@@ -129,7 +74,7 @@ TEST_F(CompanionBusTest, PostsReachTheNavigatorInOrderAndOnlyOwnWindowCommandsAr
     bool gone = false;
     QObject::connect(&companion, &CompanionBus::NavigatorGone, [&] { gone = true; });
     navigator.Leave();
-    EXPECT_TRUE(WaitFor([&] { return gone; }));
+    EXPECT_TRUE(WaitForEvents([&] { return gone; }));
     EXPECT_FALSE(companion.IsNavigatorRunning());
 }
 
@@ -148,5 +93,3 @@ TEST_F(CompanionBusTest, ANameIsHeldByOneProgramAtATime) {
 }
 
 } // namespace
-
-#include "CompanionBusTest.moc"

@@ -6,6 +6,7 @@
 #include "startpanel/StartPanelActions.h"
 #include "startpanel/StartPanelInstance.h"
 #include "support/AmbrelTest.h"
+#include "support/FakeNavigatorBroker.h"
 #include "support/RecordingProcessLauncher.h"
 
 #include <QCoreApplication>
@@ -24,56 +25,17 @@
 namespace {
 
 using Props = QMap<QString, QString>;
+using FakeNavigator = FakeNavigatorBroker;
 using namespace Qt::StringLiterals;
 
-const QString kService = u"com.brindle.QuillmarkAmbrel.AmbrelService"_s;
 const QString kPath = u"/AmbrelService"_s;
 const QString kBroker = u"com.brindle.QuillmarkAmbrel.Broker"_s;
-const QString kRecentKey = u"SOFTWARE\\Brindle\\Quillmark Ambrel\\RecentItems"_s;
-
-bool WaitFor(const std::function<bool()>& done, int timeoutMs = 10000) {
-    QElapsedTimer clock;
-    clock.start();
-    while (!done() && clock.elapsed() < timeoutMs) {
-        QEventLoop loop;
-        QTimer::singleShot(10, &loop, &QEventLoop::quit);
-        loop.exec();
-    }
-    return done();
+// Starting programs under the sanitizer takes its time.
+bool WaitFor(const std::function<bool()>& done) {
+    return WaitForEvents(done, 10000);
 }
 
-// The navigator's broker as the panel meets it, on a connection of its own: records posts.
-class FakeNavigator final : public QObject {
-    Q_OBJECT
-    Q_CLASSINFO("D-Bus Interface", "com.brindle.QuillmarkAmbrel.Broker")
-public:
-    FakeNavigator() : bus(QDBusConnection::connectToBus(QDBusConnection::SessionBus, kName)) {
-        bus.registerObject(kPath, this, QDBusConnection::ExportAllSlots);
-        registered = bus.registerService(kService);
-    }
-    ~FakeNavigator() override { Leave(); }
-
-    void Leave() {
-        if (!bus.isConnected())
-            return;
-        bus.unregisterService(kService);
-        bus.unregisterObject(kPath);
-        bus = QDBusConnection(QString());
-        QDBusConnection::disconnectFromBus(kName);
-    }
-
-    bool registered = false;
-    QList<std::pair<QString, Props>> posted;
-    QDBusConnection bus;
-
-public Q_SLOTS:
-    void Post(const QString& name, const QMap<QString, QString>& properties) {
-        posted.append({name, properties});
-    }
-
-private:
-    static inline const QString kName = u"fake-navigator"_s;
-};
+const QString kRecentKey = u"SOFTWARE\\Brindle\\Quillmark Ambrel\\RecentItems"_s;
 
 // One stored recently used entry, as the item links keep it.
 QString Entry(const QString& itemId, const QString& title, qint64 usedAt) {
@@ -231,5 +193,3 @@ TEST_F(StartPanelTest, PanelEndsWhenTheNavigatorClosesItOrLeaves) {
 }
 
 } // namespace
-
-#include "StartPanelTest.moc"
