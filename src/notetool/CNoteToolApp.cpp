@@ -6,6 +6,8 @@
 #include "notetool/CNoteEditor.h"
 #include "notetool/CNoteWindow.h"
 
+#include "ui/ShowCommand.h"
+
 #include <QCryptographicHash>
 #include <QDBusMessage>
 #include <QFileInfo>
@@ -262,23 +264,7 @@ void CNoteToolApp::OnWindowCommand(qint64 handle, const QString& command, int sh
         m_window->activateWindow();
         m_window->Editor()->setFocus();
     } else if (command == u"show") {
-        switch (showCommand) {
-        case 0:
-            m_window->hide();
-            break;
-        case 3:
-            m_window->showMaximized();
-            break;
-        case 6:
-            m_window->showMinimized();
-            break;
-        case 8:
-            m_window->show();
-            break;
-        default:
-            m_window->showNormal();
-            break;
-        }
+        ApplyShowCommand(m_window.get(), showCommand);
     }
 }
 

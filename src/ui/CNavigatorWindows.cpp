@@ -1,5 +1,7 @@
 #include "ui/CNavigatorWindows.h"
 
+#include "ui/ShowCommand.h"
+
 CNavigatorWindows::CNavigatorWindows(QWidget* ownWindow, Platform::IForeignWindows* others)
     : m_ownWindow(ownWindow), m_others(others) {}
 
@@ -15,24 +17,7 @@ bool CNavigatorWindows::Show(Platform::WindowHandle window, int showCommand) {
     QWidget* own = Own(window);
     if (own == nullptr)
         return m_others->Show(window, showCommand);
-    switch (showCommand) {
-    case Platform::ShowCommand::Hide:
-        own->hide();
-        break;
-    case Platform::ShowCommand::Minimize:
-        own->showMinimized();
-        break;
-    case Platform::ShowCommand::Maximize:
-        own->showMaximized();
-        break;
-    case Platform::ShowCommand::Restore:
-    case Platform::ShowCommand::ShowNormal:
-        own->showNormal();
-        break;
-    default:
-        own->show();
-        break;
-    }
+    ApplyShowCommand(own, showCommand);
     return true;
 }
 

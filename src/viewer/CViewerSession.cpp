@@ -2,6 +2,8 @@
 
 #include "viewer/CViewerWindow.h"
 
+#include "ui/ShowCommand.h"
+
 #include <QFileDialog>
 
 namespace {
@@ -106,28 +108,7 @@ void CViewerSession::OnWindowCommand(qint64 handle, const QString& command, int 
     } else if (command == u"focus") {
         m_window->activateWindow();
     } else if (command == u"show") {
-        switch (showCommand) {
-        case 0:
-            m_window->hide();
-            break;
-        case 3:
-            m_window->showMaximized();
-            break;
-        case 6:
-            m_window->showMinimized();
-            break;
-        case 8:
-            m_window->setAttribute(Qt::WA_ShowWithoutActivating);
-            m_window->show();
-            m_window->setAttribute(Qt::WA_ShowWithoutActivating, false);
-            break;
-        case 9:
-            m_window->showNormal();
-            break;
-        default:
-            m_window->show();
-            break;
-        }
+        ApplyShowCommand(m_window, showCommand);
     }
 }
 
