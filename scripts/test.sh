@@ -16,6 +16,12 @@ if [ -n "${AMBREL_TEST_BUILD:-}" ]; then
   esac
 fi
 
+# A compiler cache, when the machine has one, makes the second and later runs quick; paths are
+# taken relative to this folder, so a clone elsewhere finds the same entries.
+if command -v ccache >/dev/null && [ -z "${CMAKE_CXX_COMPILER_LAUNCHER:-}" ]; then
+  export CMAKE_CXX_COMPILER_LAUNCHER=ccache CCACHE_BASEDIR="$PWD" CCACHE_NOHASHDIR=true
+fi
+
 export QT_QPA_PLATFORM=offscreen
 # Leaks that belong to the libraries below the program are listed, each with its reason, in
 # the suppression file; everything else fails the test that leaked.
