@@ -16,12 +16,6 @@ using namespace Qt::StringLiterals;
 
 class InstalledProductTest : public AmbrelTest {
 protected:
-    QString CatalogText() const {
-        QFile catalog(AppDataFolder() + u"/Catalog/catalog.xml"_s);
-        return catalog.open(QIODevice::ReadOnly)
-                   ? QStringDecoder(QStringConverter::Utf16LE).decode(catalog.readAll())
-                   : QString();
-    }
     // Waits until the catalog on disk holds a note titled from the language file.
     bool WaitForNewNote() const {
         const QDeadlineTimer deadline(15000);

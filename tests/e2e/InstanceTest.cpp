@@ -31,15 +31,6 @@ protected:
             QDir(CatalogFolder()).entryList(QDir::Dirs | QDir::NoDotAndDotDot).size());
     }
 
-    QString CatalogText() const {
-        QFile file(CatalogFolder() + QStringLiteral("/catalog.xml"));
-        if (!file.open(QIODevice::ReadOnly))
-            return {};
-        const QByteArray bytes = file.readAll().mid(2); // after the byte-order mark
-        return QString::fromUtf16(reinterpret_cast<const char16_t*>(bytes.constData()),
-                                  bytes.size() / 2);
-    }
-
     template <class Condition> static bool WaitFor(Condition condition, int timeoutMs = 10000) {
         const QDeadlineTimer deadline(timeoutMs);
         while (!condition()) {

@@ -42,17 +42,10 @@ TEST_F(MessagingTest, ABusCallLinksADocumentIntoTheCatalogOnDisk) {
     }
     ASSERT_EQ(gdbus.exitCode(), 0) << gdbus.readAllStandardError().toStdString();
 
-    const QString catalogPath = Home() + u"/data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"_s;
-    const auto catalogText = [&] {
-        QFile catalog(catalogPath);
-        return catalog.open(QIODevice::ReadOnly)
-                   ? QStringDecoder(QStringConverter::Utf16LE).decode(catalog.readAll())
-                   : QString();
-    };
     const QDeadlineTimer saved(10000);
-    while (!catalogText().contains(u"<path>"_s + report + u"</path>"_s) && !saved.hasExpired())
+    while (!CatalogText().contains(u"<path>"_s + report + u"</path>"_s) && !saved.hasExpired())
         QThread::msleep(100);
-    const QString text = catalogText();
+    const QString text = CatalogText();
     EXPECT_TRUE(text.contains(u"<path>"_s + report + u"</path>"_s)) << text.toStdString();
     EXPECT_TRUE(text.contains(u"<linked>true</linked>"_s));
     ASSERT_TRUE(navigator.Terminate());

@@ -29,13 +29,6 @@ protected:
         AmbrelTest::TearDown();
     }
 
-    QString CatalogText() const {
-        QFile catalog(Home() + u"/data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"_s);
-        return catalog.open(QIODevice::ReadOnly)
-                   ? QStringDecoder(QStringConverter::Utf16LE).decode(catalog.readAll())
-                   : QString();
-    }
-
     static bool WaitFor(const std::function<bool()>& done, int timeoutMs = 15000) {
         const QDeadlineTimer deadline(timeoutMs);
         while (!done() && !deadline.hasExpired())

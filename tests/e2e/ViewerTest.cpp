@@ -65,18 +65,11 @@ TEST_F(ViewerTest, AViewedPdfOpensInTheViewerWhichEndsWithTheNavigator) {
     uint viewer = 0;
     ASSERT_TRUE(WaitUntil([&] { return (viewer = ViewerOnTheBus()) != 0; }));
 
-    const QString catalogPath = Home() + u"/data/Brindle/Quillmark Ambrel/Catalog/catalog.xml"_s;
-    const auto catalogText = [&] {
-        QFile catalog(catalogPath);
-        return catalog.open(QIODevice::ReadOnly)
-                   ? QStringDecoder(QStringConverter::Utf16LE).decode(catalog.readAll())
-                   : QString();
-    };
     EXPECT_TRUE(WaitUntil([&] {
-        const QString text = catalogText();
+        const QString text = CatalogText();
         return text.contains(u"<path>"_s + pdf + u"</path>"_s) &&
                text.contains(u"<open>true</open>"_s);
-    })) << catalogText().toStdString();
+    })) << CatalogText().toStdString();
 
     ASSERT_TRUE(navigator.Terminate());
     EXPECT_TRUE(WaitUntil([&] { return HasEnded(viewer); }, 5000));

@@ -19,6 +19,7 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QStringDecoder>
 
 void ResetSingletons() {
     ReleaseHarborUtilsInterface();
@@ -73,6 +74,13 @@ QString AmbrelTest::RuntimeHome() const {
 
 QString AmbrelTest::AppDataFolder() const {
     return DataHome() + QStringLiteral("/Brindle/Quillmark Ambrel");
+}
+
+QString AmbrelTest::CatalogText() const {
+    QFile catalog(AppDataFolder() + QStringLiteral("/Catalog/catalog.xml"));
+    return catalog.open(QIODevice::ReadOnly)
+               ? QStringDecoder(QStringConverter::Utf16LE).decode(catalog.readAll())
+               : QString();
 }
 
 QString AmbrelTest::WriteFile(const QString& relativePath, const QByteArray& content) const {
