@@ -19,9 +19,9 @@ protected:
     // Waits until the catalog on disk holds a note titled from the language file.
     bool WaitForNewNote() const {
         const QDeadlineTimer deadline(15000);
-        while (!CatalogText().contains(u"<title>New Note</title>"_s) && !deadline.hasExpired())
+        while (!CatalogFileText().contains(u"<title>New Note</title>"_s) && !deadline.hasExpired())
             QThread::msleep(100);
-        return CatalogText().contains(u"<title>New Note</title>"_s);
+        return CatalogFileText().contains(u"<title>New Note</title>"_s);
     }
 };
 
@@ -55,7 +55,7 @@ TEST_F(InstalledProductTest, InstalledTreeRunsThroughItsLink) {
     NavigatorProcess navigator(Home(), link.filePath());
     navigator.Start({u"/NewNote"_s});
     ASSERT_TRUE(navigator.WaitUntilRunning());
-    EXPECT_TRUE(WaitForNewNote()) << CatalogText().toStdString();
+    EXPECT_TRUE(WaitForNewNote()) << CatalogFileText().toStdString();
     EXPECT_TRUE(navigator.Terminate());
 }
 
@@ -75,7 +75,7 @@ TEST_F(InstalledProductTest, StartPanelNewNoteMakesANoteInTheRunningNavigator) {
     }
     ASSERT_NE(newNote, nullptr);
     newNote->click();
-    EXPECT_TRUE(WaitForNewNote()) << CatalogText().toStdString();
+    EXPECT_TRUE(WaitForNewNote()) << CatalogFileText().toStdString();
     EXPECT_TRUE(navigator.Terminate());
 }
 

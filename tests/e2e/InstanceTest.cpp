@@ -53,7 +53,7 @@ TEST_F(InstanceTest, NewNoteFromFileMakesTheNoteAndRemovesTheFile) {
     ASSERT_TRUE(navigator.Terminate());
     EXPECT_EQ(navigator.Process().exitCode(), 0);
     EXPECT_EQ(NoteCount(), 1);
-    EXPECT_TRUE(CatalogText().contains(QStringLiteral("<type>note</type>")));
+    EXPECT_TRUE(CatalogFileText().contains(QStringLiteral("<type>note</type>")));
 }
 
 TEST_F(InstanceTest, ASecondStartHandsItsNoteToTheRunningNavigator) {
@@ -141,8 +141,8 @@ TEST_F(InstanceTest, ViewDocumentWithAnAbsolutePathLinksThatDocument) {
     ASSERT_TRUE(navigator.WaitUntilRunning());
     ASSERT_TRUE(navigator.Terminate());
     EXPECT_TRUE(
-        CatalogText().contains(QStringLiteral("<path>") + document + QStringLiteral("</path>")))
-        << CatalogText().toStdString();
+        CatalogFileText().contains(QStringLiteral("<path>") + document + QStringLiteral("</path>")))
+        << CatalogFileText().toStdString();
 }
 
 TEST_F(InstanceTest, ANavigatorThatDoesNotAnswerIsReportedNotReplaced) {

@@ -43,9 +43,9 @@ TEST_F(MessagingTest, ABusCallLinksADocumentIntoTheCatalogOnDisk) {
     ASSERT_EQ(gdbus.exitCode(), 0) << gdbus.readAllStandardError().toStdString();
 
     const QDeadlineTimer saved(10000);
-    while (!CatalogText().contains(u"<path>"_s + report + u"</path>"_s) && !saved.hasExpired())
+    while (!CatalogFileText().contains(u"<path>"_s + report + u"</path>"_s) && !saved.hasExpired())
         QThread::msleep(100);
-    const QString text = CatalogText();
+    const QString text = CatalogFileText();
     EXPECT_TRUE(text.contains(u"<path>"_s + report + u"</path>"_s)) << text.toStdString();
     EXPECT_TRUE(text.contains(u"<linked>true</linked>"_s));
     ASSERT_TRUE(navigator.Terminate());

@@ -80,17 +80,17 @@ TEST_F(NoteToolTest, ANoteOpenedByTheNavigatorIsRenamedAndClosedInTheNoteTool) {
     NavigatorProcess navigator(Home());
     const QString noteTool = OpenNewNote(navigator);
     ASSERT_FALSE(noteTool.isEmpty());
-    EXPECT_TRUE(WaitFor([&] { return CatalogText().contains(u"<open>true</open>"_s); }));
+    EXPECT_TRUE(WaitFor([&] { return CatalogFileText().contains(u"<open>true</open>"_s); }));
 
     EXPECT_EQ(CallNoteTool(noteTool, u"SetTitle"_s, {u"Shopping list"_s}).type(),
               QDBusMessage::ReplyMessage);
     EXPECT_EQ(CallNoteTool(noteTool, u"Close"_s).type(), QDBusMessage::ReplyMessage);
     EXPECT_TRUE(WaitFor([] { return NoteToolName().isEmpty(); }));
     EXPECT_TRUE(WaitFor([&] {
-        const QString catalog = CatalogText();
+        const QString catalog = CatalogFileText();
         return catalog.contains(u"<title>Shopping list</title>"_s) &&
                catalog.contains(u"<open>false</open>"_s);
-    })) << CatalogText().toStdString();
+    })) << CatalogFileText().toStdString();
 
     const QString catalogFolder = Home() + u"/data/Brindle/Quillmark Ambrel/Catalog"_s;
     const QStringList items = QDir(catalogFolder).entryList(QDir::Dirs | QDir::NoDotAndDotDot);
@@ -109,7 +109,7 @@ TEST_F(NoteToolTest, TheNavigatorClosesTheNoteToolWhenItEnds) {
     CallNoteTool(noteTool, u"SetTitle"_s, {u"Draft"_s});
     const QDBusReply<bool> saved = CallNoteTool(noteTool, u"Save"_s);
     ASSERT_TRUE(saved.isValid() && saved.value());
-    ASSERT_TRUE(WaitFor([&] { return CatalogText().contains(u"<title>Draft</title>"_s); }));
+    ASSERT_TRUE(WaitFor([&] { return CatalogFileText().contains(u"<title>Draft</title>"_s); }));
 
     ASSERT_TRUE(navigator.Terminate());
     EXPECT_TRUE(WaitFor([] { return NoteToolName().isEmpty(); }));

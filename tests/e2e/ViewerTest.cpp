@@ -66,10 +66,10 @@ TEST_F(ViewerTest, AViewedPdfOpensInTheViewerWhichEndsWithTheNavigator) {
     ASSERT_TRUE(WaitUntil([&] { return (viewer = ViewerOnTheBus()) != 0; }));
 
     EXPECT_TRUE(WaitUntil([&] {
-        const QString text = CatalogText();
+        const QString text = CatalogFileText();
         return text.contains(u"<path>"_s + pdf + u"</path>"_s) &&
                text.contains(u"<open>true</open>"_s);
-    })) << CatalogText().toStdString();
+    })) << CatalogFileText().toStdString();
 
     ASSERT_TRUE(navigator.Terminate());
     EXPECT_TRUE(WaitUntil([&] { return HasEnded(viewer); }, 5000));

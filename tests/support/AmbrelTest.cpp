@@ -76,7 +76,7 @@ QString AmbrelTest::AppDataFolder() const {
     return DataHome() + QStringLiteral("/Brindle/Quillmark Ambrel");
 }
 
-QString AmbrelTest::CatalogText() const {
+QString AmbrelTest::CatalogFileText() const {
     QFile catalog(AppDataFolder() + QStringLiteral("/Catalog/catalog.xml"));
     return catalog.open(QIODevice::ReadOnly)
                ? QStringDecoder(QStringConverter::Utf16LE).decode(catalog.readAll())

@@ -28,7 +28,7 @@ protected:
     // "$XDG_DATA_HOME/Brindle/Quillmark Ambrel".
     QString AppDataFolder() const;
     // The catalog file as text, as a navigator in this home wrote it; empty when there is none.
-    QString CatalogText() const;
+    QString CatalogFileText() const;
 
     // Writes a file (making its folder), answering its path.
     QString WriteFile(const QString& relativePath, const QByteArray& content) const;
