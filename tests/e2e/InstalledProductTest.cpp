@@ -1,4 +1,4 @@
-#include "NavigatorProcess.h"
+#include "support/NavigatorProcess.h"
 #include "startpanel/CStartPanelDlg.h"
 #include "startpanel/StartPanelActions.h"
 #include "support/AmbrelTest.h"

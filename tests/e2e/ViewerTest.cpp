@@ -1,4 +1,4 @@
-#include "NavigatorProcess.h"
+#include "support/NavigatorProcess.h"
 #include "support/AmbrelTest.h"
 #include "viewer/SamplePdf.h"
 
