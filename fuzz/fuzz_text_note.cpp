@@ -3,7 +3,7 @@
 #include "FuzzEnvironment.h"
 
 #include "common/ReleasePtr.h"
-#include "notes/CTextFileNoteConstructor.h"
+#include "notes/NoteConstructorRegistry.h"
 #include "notetool/CNoteFile.h"
 #include "platform/IMessageBox.h"
 #include "support/RecordingMessageBox.h"
@@ -34,7 +34,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     Platform::SetMessageBox(&messages);
     int made = 0;
     {
-        ReleasePtr<CBasicNoteConstructor> constructor(new CTextFileNoteConstructor(source));
+        // The constructor the navigator picks for a ".txt" file: the text file one.
+        ReleasePtr<CBasicNoteConstructor> constructor(CreateNoteConstructor(source));
+        FuzzEnvironment::Require(constructor != nullptr, "a text file has a note constructor");
         constructor->SetNoteDefaults(NoteDefaults());
         made = constructor->Create(notePath, QStringLiteral("Dropped"));
     }
