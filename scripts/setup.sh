@@ -12,6 +12,7 @@ packages=(
   googletest libgtest-dev libgmock-dev libbenchmark-dev
   dbus-daemon dbus-bin xdg-utils desktop-file-utils
   fonts-dejavu-core
+  clang-14 libfuzzer-14-dev
 )
 
 missing=()

@@ -1,7 +1,9 @@
 #!/usr/bin/env bash
 # Sets up, builds and runs every test twice: a Debug build in build-test/ and a build with
 # AddressSanitizer and UndefinedBehaviorSanitizer in build-asan/, both with warnings as errors,
-# offscreen inside a private session bus. AMBREL_TEST_BUILD=debug or =asan runs one of them.
+# offscreen inside a private session bus; then, where clang-14 is installed, builds the fuzz
+# targets in build-fuzz/ and runs each for 10 s over its seed corpus. AMBREL_TEST_BUILD=debug,
+# =asan or =fuzz runs one of the three.
 # Extra arguments go to ctest (for example -R Name).
 set -euo pipefail
 cd "$(dirname "$0")/.."
@@ -9,10 +11,12 @@ cd "$(dirname "$0")/.."
 scripts/setup.sh
 
 builds=(debug asan)
+fuzz=yes
 if [ -n "${AMBREL_TEST_BUILD:-}" ]; then
   case "$AMBREL_TEST_BUILD" in
-    debug | asan) builds=("$AMBREL_TEST_BUILD") ;;
-    *) echo "AMBREL_TEST_BUILD is debug or asan, not '$AMBREL_TEST_BUILD'." >&2; exit 2 ;;
+    debug | asan) builds=("$AMBREL_TEST_BUILD"); fuzz=no ;;
+    fuzz) builds=() ;;
+    *) echo "AMBREL_TEST_BUILD is debug, asan or fuzz, not '$AMBREL_TEST_BUILD'." >&2; exit 2 ;;
   esac
 fi
 
@@ -29,7 +33,7 @@ export ASAN_OPTIONS=detect_leaks=1:abort_on_error=0:strict_string_checks=1:detec
 export LSAN_OPTIONS="suppressions=$PWD/tests/sanitizer/lsan.supp:print_suppressions=0"
 export UBSAN_OPTIONS=print_stacktrace=1:halt_on_error=1
 
-for build in "${builds[@]}"; do
+for build in ${builds[@]+"${builds[@]}"}; do
   directory=build-test
   options=()
   if [ "$build" = asan ]; then
@@ -44,3 +48,8 @@ for build in "${builds[@]}"; do
   cmake --build "$directory" --parallel "$(nproc)"
   dbus-run-session -- ctest --test-dir "$directory" --output-on-failure --parallel "$(nproc)" "$@"
 done
+
+if [ "$fuzz" = yes ] && command -v clang++-14 >/dev/null; then
+  echo "== fuzz build, in build-fuzz/"
+  scripts/fuzz.sh all 10
+fi

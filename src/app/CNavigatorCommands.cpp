@@ -65,9 +65,10 @@ void CNavigatorCommands::Register(CCommandRouter& router, WNavigatorTree* tree) 
         {32796, WNavDS::TypeFilter::Doc},   {32797, WNavDS::TypeFilter::Pdf},
         {32798, WNavDS::TypeFilter::All},
     };
-    for (const auto& [id, filter] : filters) {
-        router.Register({id}, {[filter] { Model()->ChooseTypeFilter(filter); }, nullptr,
-                               [filter] { return Model()->IsTypeFilterChosen(filter); }});
+    for (const auto& entry : filters) {
+        const WNavDS::TypeFilter filter = entry.second;
+        router.Register({entry.first}, {[filter] { Model()->ChooseTypeFilter(filter); }, nullptr,
+                                        [filter] { return Model()->IsTypeFilterChosen(filter); }});
     }
     router.Register({32799}, {[] { Model()->ToggleOpenedItemsOnly(); }, nullptr,
                               [] { return Model()->IsOpenedItemsOnly(); }});

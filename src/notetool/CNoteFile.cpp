@@ -157,7 +157,7 @@ void ReadHeader(const QString& text, NoteContent* content) {
     for (const auto& [name, value] : Declarations(styleSheet, "BODY"_L1)) {
         if (name == u"BACKGROUND")
             ReadBackground(value, content);
-        else if (name == u"FONT-FAMILY")
+        else if (name == u"FONT-FAMILY" && !value.isEmpty()) // an empty name names no font
             content->fontFamily = value;
         else if (name == u"FONT-SIZE")
             ReadNumber(value, "pt"_L1, &content->fontSize);

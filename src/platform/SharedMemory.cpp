@@ -80,6 +80,24 @@ std::optional<QStringList> SharedMemory::DecodeArguments(const QByteArray& body)
     return arguments;
 }
 
+SharedMemory::Reading SharedMemory::ReadMessage(const QByteArray& received,
+                                                QStringList* arguments) {
+    if (received.size() < 4)
+        return Reading::Incomplete;
+    const quint32 length = qFromBigEndian<quint32>(received.constData());
+    if (length > quint32(kMaximumMessageBytes))
+        return Reading::Refused;
+    if (received.size() < 4 + qsizetype(length))
+        return Reading::Incomplete;
+    if (received.size() != 4 + qsizetype(length))
+        return Reading::Refused;
+    std::optional<QStringList> decoded = DecodeArguments(received.mid(4));
+    if (!decoded)
+        return Reading::Refused;
+    *arguments = std::move(*decoded);
+    return Reading::Complete;
+}
+
 bool SharedMemory::Listen(const QString& name) {
     Close();
     const QString path = SocketPath(name);
@@ -157,27 +175,17 @@ void SharedMemory::Watch(QLocalSocket* socket) {
     auto reading = std::make_shared<QMetaObject::Connection>();
     const auto read = [=, this] {
         buffer->append(socket->readAll());
-        if (buffer->size() < 4)
-            return;
-        const quint32 length = qFromBigEndian<quint32>(buffer->constData());
-        if (length > quint32(kMaximumMessageBytes)) {
-            disconnect(*reading);
-            patience->stop();
-            Answer(socket, kAnswerRefused);
-            return;
-        }
-        if (buffer->size() < 4 + qsizetype(length))
+        QStringList arguments;
+        const Reading outcome = ReadMessage(*buffer, &arguments);
+        if (outcome == Reading::Incomplete)
             return;
         disconnect(*reading);
         patience->stop();
-        std::optional<QStringList> arguments;
-        if (buffer->size() == 4 + qsizetype(length))
-            arguments = DecodeArguments(buffer->mid(4));
-        if (!arguments) {
+        if (outcome == Reading::Refused) {
             Answer(socket, kAnswerRefused);
             return;
         }
-        m_received.append({socket, *arguments});
+        m_received.append({socket, arguments});
         HandleReceived();
     };
     *reading = connect(socket, &QLocalSocket::readyRead, this, read);

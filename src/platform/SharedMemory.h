@@ -51,6 +51,12 @@ public:
     static QByteArray EncodeArguments(const QStringList& arguments);
     static std::optional<QStringList> DecodeArguments(const QByteArray& body);
 
+    // What the bytes received so far on a connection make: not yet a whole message, one to
+    // refuse (over the size limit, bytes after it, a body that is no message), or a message,
+    // whose arguments then go to `arguments`.
+    enum class Reading { Incomplete, Refused, Complete };
+    static Reading ReadMessage(const QByteArray& received, QStringList* arguments);
+
     // Starts listening. A socket file already at the path is taken for a dead navigator's and
     // replaced, so call this only while holding the start-up mutex and after no navigator
     // answered there.

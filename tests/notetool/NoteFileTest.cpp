@@ -137,6 +137,20 @@ TEST_F(NoteFileTest, DamagedOrForeignFilesOpenAsFarAsTheyCanBeRead) {
     }
 }
 
+TEST_F(NoteFileTest, ANoteWithAnEmptyFontKeepsItsFontWhenSavedAgain) {
+    // An empty font name names no font: the note keeps the font it has, and a second save
+    // writes the same file as the first.
+    NoteContent read;
+    ASSERT_TRUE(CNoteFile::Parse("<HTML><HEAD><STYLE> BODY { FONT-FAMILY : ;FONT-SIZE : 9 pt; } "
+                                 "</STYLE></HEAD><BODY><DIV>x</DIV></BODY></HTML>",
+                                 &read));
+    EXPECT_EQ(read.fontFamily, u"Times New Roman"_s);
+    const QByteArray saved = CNoteFile::Format(read);
+    NoteContent reread;
+    ASSERT_TRUE(CNoteFile::Parse(saved, &reread));
+    EXPECT_EQ(CNoteFile::Format(reread), saved);
+}
+
 TEST_F(NoteFileTest, AFileThatIsNoTextIsShownReadOnlyAndNeverWrittenOver) {
     const QByteArray cases[] = {kHeader + "<P>a\0b</P>" + QByteArray(1, '\0') + "x",
                                 kHeader + "<P>\xFF\xFE\xFD binary</P></DIV></BODY></HTML>"};

@@ -1,0 +1,114 @@
+#include "FuzzEnvironment.h"
+
+#include "catalog/IDataStoreService.h"
+#include "libs/lustre/CVisualStyleManager.h"
+#include "libs/sheen/ThemeUtilities.h"
+#include "libs/toolwell/CHarborUtils.h"
+#include "libs/toolwell/IItemWindowHub.h"
+#include "libs/toolwell/ISnapshotService.h"
+#include "messaging/CNoteToolService.h"
+#include "messaging/CViewerService.h"
+#include "navigator/WNavDS.h"
+#include "platform/IForeignWindows.h"
+#include "platform/IMessageBox.h"
+#include "platform/IProcessLauncher.h"
+#include "platform/IWaitCursor.h"
+#include "platform/Registry.h"
+#include "settings/NavigatorSettings.h"
+
+#include <QApplication>
+#include <QCoreApplication>
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+
+namespace FuzzEnvironment {
+
+namespace {
+
+QString g_home;
+// Made once and kept to the end of the process, as in the program.
+QCoreApplication* g_application = nullptr;
+
+} // namespace
+
+void SetUp(int* argc, char*** argv, Application application) {
+    char pattern[] = "/tmp/ambrel-fuzz-XXXXXX";
+    if (::mkdtemp(pattern) == nullptr) {
+        std::perror("mkdtemp");
+        std::abort();
+    }
+    g_home = QString::fromLocal8Bit(pattern);
+    const QString data = g_home + QStringLiteral("/data");
+    const QString config = g_home + QStringLiteral("/config");
+    const QString runtime = g_home + QStringLiteral("/runtime");
+    for (const QString& folder : {data, config, runtime})
+        QDir().mkpath(folder);
+    QFile::setPermissions(runtime, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+    qputenv("HOME", QFile::encodeName(g_home));
+    qputenv("XDG_DATA_HOME", QFile::encodeName(data));
+    qputenv("XDG_CONFIG_HOME", QFile::encodeName(config));
+    qputenv("XDG_RUNTIME_DIR", QFile::encodeName(runtime));
+    qputenv("QT_QPA_PLATFORM", "offscreen");
+    // No session bus: the program then runs without a broker, as it does on a bare desktop.
+    qunsetenv("DBUS_SESSION_BUS_ADDRESS");
+    if (application == Application::Gui)
+        g_application = new QApplication(*argc, *argv);
+    else
+        g_application = new QCoreApplication(*argc, *argv);
+    Platform::Registry::SetMachineFile(g_home + QStringLiteral("/etc/Quillmark Ambrel.ini"));
+}
+
+QString Home() {
+    return g_home;
+}
+
+QString AppDataFolder() {
+    return g_home + QStringLiteral("/data/Brindle/Quillmark Ambrel");
+}
+
+void RemoveAppData() {
+    QDir(AppDataFolder()).removeRecursively();
+}
+
+void ResetProgram() {
+    ReleaseHarborUtilsInterface();
+    Platform::SetMessageBox(nullptr);
+    Platform::SetWaitCursor(nullptr);
+    Platform::SetProcessLauncher(nullptr);
+    SetSnapshotNoteHandler({});
+    WNavDS::DestroyInstance();
+    if (IDataStoreService* service = GetDataStoreService())
+        service->Shutdown(0);
+    NavigatorSettings::DestroyInstance();
+    CNoteToolService::ResetInstance();
+    CViewerService::ResetInstance();
+    SetItemWindowHub(nullptr);
+    Platform::SetForeignWindows(nullptr);
+    ShutdownThemeUtilities();
+    DeleteVisualStyleManager();
+}
+
+QByteArray ReadFile(const QString& path) {
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+bool WriteFile(const QString& path, const QByteArray& bytes) {
+    QDir().mkpath(QFileInfo(path).absolutePath());
+    QFile file(path);
+    return file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size();
+}
+
+void Require(bool condition, const char* what) {
+    if (condition)
+        return;
+    std::fprintf(stderr, "fuzz property broken: %s\n", what);
+    std::abort();
+}
+
+} // namespace FuzzEnvironment
