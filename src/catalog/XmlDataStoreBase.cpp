@@ -1,8 +1,12 @@
 #include "catalog/XmlDataStoreBase.h"
 
+#include <QByteArrayView>
 #include <QFile>
 #include <QFileInfo>
 #include <QSaveFile>
+#include <QString>
+
+#include <optional>
 
 namespace Brindle::Data::XmlAccess {
 
@@ -98,6 +102,39 @@ qsizetype ToUtf8(const char* bytes, qsizetype units, char16_t* lead, char* out) 
 // The UTF-8 text of a file in UTF-16 LE with byte-order mark (the form the store writes), read
 // a piece at a time, so that the whole UTF-16 text is never in memory beside it. Null for any
 // other file, which the parser reads itself.
+// Bytes that are not UTF-8 would be dropped when the catalog is written as UTF-16, so a save
+// could change names and values behind the reader's back; a damaged element name could even
+// become a reference. They are read as U+FFFD instead, which is written back as it reads.
+class Utf8Repair final : public pugi::xml_tree_walker {
+public:
+    bool for_each(pugi::xml_node& node) override {
+        if (const auto name = Repaired(node.name()))
+            node.set_name(name->constData());
+        // An element's own text is kept in the element, where only its text object reaches it.
+        if (const auto value = Repaired(node.value())) {
+            if (node.type() == pugi::node_element)
+                node.text().set(value->constData());
+            else
+                node.set_value(value->constData());
+        }
+        for (pugi::xml_attribute attribute : node.attributes()) {
+            if (const auto name = Repaired(attribute.name()))
+                attribute.set_name(name->constData());
+            if (const auto value = Repaired(attribute.value()))
+                attribute.set_value(value->constData());
+        }
+        return true;
+    }
+
+private:
+    static std::optional<QByteArray> Repaired(const char* text) {
+        const QByteArrayView view(text);
+        if (view.isValidUtf8())
+            return std::nullopt;
+        return QString::fromUtf8(view).toUtf8();
+    }
+};
+
 QByteArray ReadUtf16File(const QString& path) {
     QFile file(path);
     if (!file.open(QIODevice::ReadOnly))
@@ -175,6 +212,10 @@ bool XmlDataStoreBase::LoadFrom(const QString& path) {
                                                  pugi::encoding_utf8);
     } else {
         result = m_document->load_file(QFile::encodeName(path).constData(), options);
+        if (result) {
+            Utf8Repair repair;
+            m_document->traverse(repair);
+        }
     }
     const bool loaded = result && m_document->document_element() && AcceptDocument(*m_document);
     if (!loaded) {

@@ -307,6 +307,24 @@ TEST_F(XmlDataStoreTest, SavedCatalogIsUtf16AndKeepsEveryCharacter) {
     }
 }
 
+TEST_F(XmlDataStoreTest, BytesThatAreNotUtf8ReadAsTheyWillBeWritten) {
+    // A damaged element name beside the reference, and a damaged title.
+    WriteCatalog(CatalogText("<c\xC8\xC8hild uuidref=\"A\"/><child uuidref=\"B\"/>",
+                             "<note uuid=\"A\"/><note uuid=\"B\"><properties>"
+                             "<title>caf\xE9</title></properties></note>"));
+    auto store = OpenStore();
+    const QStringList before = Children(*store, kRoot);
+    QString title;
+    ASSERT_TRUE(store->ReadProperty(kB, QStringLiteral("title"), &title));
+    EXPECT_EQ(title, QStringLiteral("caf\uFFFD"));
+    ASSERT_TRUE(store->Save());
+
+    auto reloaded = OpenStore();
+    EXPECT_EQ(Children(*reloaded, kRoot), before);
+    ASSERT_TRUE(reloaded->ReadProperty(kB, QStringLiteral("title"), &title));
+    EXPECT_EQ(title, QStringLiteral("caf\uFFFD"));
+}
+
 TEST_F(XmlDataStoreTest, LargeUtf16CatalogReadsBackEveryCharacter) {
     // The file is read a mebibyte at a time: a surrogate pair is put across the first boundary.
     const QString head = QString::fromUtf8(CatalogText("<child uuidref=\"A\"/>", ""))
