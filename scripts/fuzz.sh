@@ -4,6 +4,8 @@
 # Ends with one line per target: "fuzz NAME: N executions in S s, no finding" or
 # "..., FINDING: <artifact>" (and exit status 1).
 #   scripts/fuzz.sh NAME SECONDS      scripts/fuzz.sh all SECONDS
+# AMBREL_FUZZ_SEED fixes libFuzzer's random seed, so that a short run mutates the same way each
+# time.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -49,6 +51,7 @@ for target in "${selected[@]}"; do
   options=(-max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 -print_final_stats=1
     -artifact_prefix="$artifacts/")
   [ -f "fuzz/dict/$target.dict" ] && options+=(-dict="fuzz/dict/$target.dict")
+  [ -n "${AMBREL_FUZZ_SEED:-}" ] && options+=(-seed="$AMBREL_FUZZ_SEED")
   log=build-fuzz/fuzz-$target.log
   started=$(date +%s)
   set +e
