@@ -22,6 +22,7 @@
 #include "ui/WMainFrame.h"
 
 #include <QApplication>
+#include <QDeadlineTimer>
 
 #include <cstdio>
 
@@ -29,6 +30,8 @@ namespace {
 
 constexpr int kDefaultWidth = 280;
 constexpr int kDefaultHeight = 650;
+// The most time one idle pass gives to queued messages before the window may answer again.
+constexpr int kMessageSliceMs = 50;
 
 QtMessageBox g_messageBox;
 QtWaitCursor g_waitCursor;
@@ -200,7 +203,8 @@ bool CNavigatorApp::OnIdle(int count) {
     }
     m_mainWindow->OnIdleWork();
     NavigatorSettings::Instance()->SaveIfDirty();
-    m_instanceManager.ProcessQueue();
+    // A burst of messages is handled a slice per pass, so the window answers in between.
+    const bool messagesLeft = m_instanceManager.ProcessQueue(QDeadlineTimer(kMessageSliceMs));
     if (m_firstIdle)
         RunFirstIdleWork();
     // The idle pass only runs once the queue is empty, so the window has been shown and
@@ -208,7 +212,7 @@ bool CNavigatorApp::OnIdle(int count) {
     // starts; running them clears them.
     RunStartActions(m_commandLineInfo, m_startActions);
     m_singleInstance->RunHandedOver(m_startActions);
-    return count < 1;
+    return count < 1 || messagesLeft;
 }
 
 int CNavigatorApp::ExitInstance() {

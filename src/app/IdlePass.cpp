@@ -2,7 +2,10 @@
 
 #include <QAbstractEventDispatcher>
 #include <QCoreApplication>
+#include <QElapsedTimer>
 #include <QEvent>
+
+Q_LOGGING_CATEGORY(lcIdlePass, "ambrel.idle", QtInfoMsg)
 
 IdlePass::IdlePass(Handler handler, QObject* parent)
     : QObject(parent), m_handler(std::move(handler)) {}
@@ -46,8 +49,11 @@ void IdlePass::OnAboutToBlock() {
         return;
     }
     m_inPass = true;
+    QElapsedTimer duration;
+    duration.start();
     const bool more = m_handler(m_count);
     m_inPass = false;
+    qCDebug(lcIdlePass, "idle pass %d: %.1f ms", m_count, double(duration.nsecsElapsed()) / 1e6);
     ++m_passesRun;
     if (more) {
         ++m_count;

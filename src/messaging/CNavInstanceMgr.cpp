@@ -100,13 +100,16 @@ void CNavInstanceMgr::OnWindowsGone(const QList<Platform::WindowHandle>& windows
     }
 }
 
-void CNavInstanceMgr::ProcessQueue() {
+bool CNavInstanceMgr::ProcessQueue(QDeadlineTimer deadline) {
     // A message may run a nested event loop in which more arrive: they join this round.
     while (!m_queue.empty()) {
         const std::unique_ptr<CMethodNode> node = std::move(m_queue.front());
         m_queue.pop_front();
         Dispatch(node->Name(), node->Properties());
+        if (deadline.hasExpired())
+            break;
     }
+    return !m_queue.empty();
 }
 
 void CNavInstanceMgr::Dispatch(const QString& name, DataExchange::IProperties* properties) {

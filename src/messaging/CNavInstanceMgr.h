@@ -3,6 +3,8 @@
 #include "libs/toolwell/IMsgEvent.h"
 #include "messaging/CMethodNode.h"
 
+#include <QDeadlineTimer>
+
 #include <deque>
 #include <memory>
 
@@ -23,8 +25,11 @@ public:
     void OnNewNote() override;
     void OnWindowsGone(const QList<Platform::WindowHandle>& windows) override;
 
-    // Dispatches and deletes the queued messages, oldest first.
-    void ProcessQueue();
+    // Dispatches and deletes the queued messages, oldest first: all of them, or, given a
+    // deadline, at least one and no more once the deadline has passed, so that a burst of
+    // messages is handled in slices between which the window answers. Answers whether messages
+    // are left.
+    bool ProcessQueue(QDeadlineTimer deadline = QDeadlineTimer(QDeadlineTimer::Forever));
     // Acts on one message; names compare exactly, unknown ones do nothing.
     void Dispatch(const QString& name, DataExchange::IProperties* properties);
 

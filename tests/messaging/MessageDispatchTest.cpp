@@ -260,6 +260,19 @@ TEST_F(MessageDispatchTest, MessagesDuringAModalWaitForTheIdlePassInArrivalOrder
     EXPECT_EQ(CatalogValue(note, u"title"_s), u"Second"_s);
 }
 
+TEST_F(MessageDispatchTest, ABurstIsHandledInSlicesThatKeepTheArrivalOrder) {
+    for (const QString& title : {u"First"_s, u"Second"_s, u"Third"_s})
+        peer->Post(u"UpdateMetadata"_s, {{u"itemid"_s, note}, {u"title"_s, title}});
+    ASSERT_EQ(manager.QueueLength(), 3);
+    // A pass whose time is up still handles one message, the oldest, and tells that more wait.
+    EXPECT_TRUE(manager.ProcessQueue(QDeadlineTimer(0)));
+    EXPECT_EQ(manager.QueueLength(), 2);
+    EXPECT_EQ(CatalogValue(note, u"title"_s), u"First"_s);
+    EXPECT_FALSE(manager.ProcessQueue());
+    EXPECT_EQ(manager.QueueLength(), 0);
+    EXPECT_EQ(CatalogValue(note, u"title"_s), u"Third"_s);
+}
+
 TEST_F(MessageDispatchTest, WindowRequestsGoToTheOwningProgramOnlyAndItsLeavingClosesThem) {
     Peer bystander(u"bystander"_s);
     Deliver(u"NoteOpenNotification"_s, {{u"itemid"_s, note}, {u"openwindowhandle"_s, u"7"_s}});
