@@ -2,6 +2,7 @@
 
 #include "notes/CHTMLBackgroundStyle.h"
 #include "notes/CNoteDocumentCreator.h"
+#include "platform/FileWrite.h"
 
 #include <QFile>
 #include <QFileInfo>
@@ -206,7 +207,7 @@ bool CNoteFile::Save(const NoteContent& content) {
     const QByteArray bytes = Format(content);
     // A small note stays in the write buffer until the flush; commit would not see that write
     // fail and would put a cut file in place of the note.
-    if (file.write(bytes) != bytes.size() || !file.flush()) {
+    if (!Platform::WriteAll(file, bytes.constData(), bytes.size()) || !Platform::FlushAll(file)) {
         m_saveError = file.errorString();
         file.cancelWriting();
         return false;
