@@ -193,7 +193,7 @@ TEST_F(NavigatorAppTest, AFullDiskIsToldOncePerFileAndTheSavesAreTriedAgainUntil
     ASSERT_FALSE(catalog.isEmpty());
     ASSERT_FALSE(settings.isEmpty());
     WNavDS* navigator = WNavDS::Instance();
-    const QString folderPath = AppDataFolder() + u"/Catalog/catalog.xml"_s;
+    const QString catalogPath = AppDataFolder() + u"/Catalog/catalog.xml"_s;
     const QString settingsPath = AppDataFolder() + u"/NavSettings.dat"_s;
 
     // Both files change at every pass, and every save fails.
@@ -212,7 +212,7 @@ TEST_F(NavigatorAppTest, AFullDiskIsToldOncePerFileAndTheSavesAreTriedAgainUntil
     EXPECT_EQ(Read(u"NavSettings.dat"_s), settings);
     EXPECT_EQ(QDir(AppDataFolder()).entryList(QDir::Files), QStringList{u"NavSettings.dat"_s});
     ASSERT_EQ(box.shown.size(), 2) << "one message for each file";
-    for (const auto& [index, path] : {std::pair{0, folderPath}, std::pair{1, settingsPath}}) {
+    for (const auto& [index, path] : {std::pair{0, catalogPath}, std::pair{1, settingsPath}}) {
         EXPECT_TRUE(box.shown[index].text.contains(path)) << box.shown[index].text.toStdString();
         EXPECT_TRUE(box.shown[index].text.contains(u"File too large"_s));
     }
