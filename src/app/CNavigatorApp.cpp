@@ -12,6 +12,7 @@
 #include "messaging/ActivityCenter.h"
 #include "messaging/IWindowCallback.h"
 #include "navigator/WNavDS.h"
+#include "platform/SaveFailureNotice.h"
 #include "settings/CNavigatorBloggingSettingsDlg.h"
 #include "settings/CNavigatorSettingsDlg.h"
 #include "settings/NavigatorSettings.h"
@@ -141,7 +142,11 @@ bool CNavigatorApp::StartUp() {
 
     // A start from then on waits for this navigator to end instead of handing its command line
     // to one that is going away.
-    connect(m_mainWindow, &WMainFrame::Closing, this, [this] { m_singleInstance->Withdraw(); });
+    connect(m_mainWindow, &WMainFrame::Closing, this, [this] {
+        m_singleInstance->Withdraw();
+        // A message box could no longer open: what fails from here on is written out.
+        Platform::SaveFailureNotice::Instance().SetSilent(true);
+    });
     m_singleInstance->Publish([this] {
         if (m_mainWindow) {
             m_mainWindow->showNormal();
@@ -195,14 +200,16 @@ void CNavigatorApp::PlaceMainWindow() {
 }
 
 bool CNavigatorApp::OnIdle(int count) {
-    if (WNavDS::Instance()->IsChanged() && m_dataStoreService != nullptr)
-        m_dataStoreService->Save();
+    // The tree's rebuild below clears the change flag, so a failed save is remembered here and
+    // tried again at every pass until it works.
+    if ((WNavDS::Instance()->IsChanged() || m_catalogUnsaved) && m_dataStoreService != nullptr)
+        SaveCatalog();
     if (!m_mainWindow) {
         QCoreApplication::exit(0);
         return false;
     }
     m_mainWindow->OnIdleWork();
-    NavigatorSettings::Instance()->SaveIfDirty();
+    ReportSettingsSave(NavigatorSettings::Instance()->SaveIfDirty());
     // A burst of messages is handled a slice per pass, so the window answers in between.
     const bool messagesLeft = m_instanceManager.ProcessQueue(QDeadlineTimer(kMessageSliceMs));
     if (m_firstIdle)
@@ -218,6 +225,7 @@ bool CNavigatorApp::OnIdle(int count) {
 int CNavigatorApp::ExitInstance() {
     // Nothing may wait for an answer while the program ends.
     const ModalDialog::ClosingAll noMoreDialogs;
+    Platform::SaveFailureNotice::Instance().SetSilent(true);
     // The window's close withdraws the navigator too; without a window it happens here.
     if (m_singleInstance)
         m_singleInstance->Withdraw();
@@ -227,7 +235,7 @@ int CNavigatorApp::ExitInstance() {
     if (settings->GetCleanDeletedOnClose())
         WNavDS::Instance()->EmptyDeletedItems();
     if (settings->IsDirty())
-        settings->Save();
+        ReportSettingsSave(settings->Save());
     if (m_windows) {
         Platform::SetForeignWindows(nullptr);
         m_windows.reset();
@@ -240,7 +248,8 @@ int CNavigatorApp::ExitInstance() {
     CNavigatorSettingsDlg::SetBloggingPageFactory({});
     WNavDS::DestroyInstance();
     if (m_dataStoreService != nullptr) {
-        m_dataStoreService->Shutdown(1);
+        SaveCatalog();
+        m_dataStoreService->Shutdown(0);
         m_dataStoreService = nullptr;
     }
     m_dataStoreHost.reset();
@@ -251,6 +260,28 @@ int CNavigatorApp::ExitInstance() {
     m_applicationInfo.reset();
     m_singleInstance.reset();
     return m_exitCode;
+}
+
+void CNavigatorApp::SaveCatalog() {
+    m_catalogUnsaved = m_dataStoreService->Save() != S_OK;
+    QString path;
+    QString reason;
+    UnicodeStringPtr pathSink(&path);
+    UnicodeStringPtr reasonSink(&reason);
+    Platform::SaveFailureNotice& notice = Platform::SaveFailureNotice::Instance();
+    if (m_dataStoreService->GetSaveError(&pathSink, &reasonSink) == S_OK)
+        notice.Failed(Platform::SavedFile::Catalog, path, reason);
+    else if (!m_catalogUnsaved)
+        notice.Saved(Platform::SavedFile::Catalog);
+}
+
+void CNavigatorApp::ReportSettingsSave(bool saved) {
+    Platform::SaveFailureNotice& notice = Platform::SaveFailureNotice::Instance();
+    if (saved)
+        notice.Saved(Platform::SavedFile::Settings);
+    else
+        notice.Failed(Platform::SavedFile::Settings, NavigatorSettings::SettingsFilePath(),
+                      NavigatorSettings::Instance()->SaveError());
 }
 
 void CNavigatorApp::ConnectMessageBroker() {

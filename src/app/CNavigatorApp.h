@@ -57,6 +57,9 @@ private:
     void PlaceMainWindow();
     void ConnectMessageBroker();
     void RunFirstIdleWork();
+    // Writes the catalog; a failure is told to the user and the save tried again later.
+    void SaveCatalog();
+    void ReportSettingsSave(bool saved);
 
     QStringList m_arguments;
     std::unique_ptr<SingleInstance> m_singleInstance;
@@ -64,7 +67,7 @@ private:
     CNavigatorStartActions m_startActions;
     ReleasePtr<Brindle::Application::IApplicationInfo> m_applicationInfo;
     ReleasePtr<IDataStoreHost> m_dataStoreHost;
-    IDataStoreService* m_dataStoreService = nullptr; // ended with Shutdown(1), which saves
+    IDataStoreService* m_dataStoreService = nullptr; // saved last, then Shutdown(0)
     QPointer<WMainFrame> m_mainWindow;
     std::unique_ptr<IdlePass> m_idlePass;
     std::unique_ptr<TerminationSignals> m_terminationSignals;
@@ -75,4 +78,6 @@ private:
     // broker's bus side underneath, so it goes before the broker.
     std::unique_ptr<CNavigatorWindows> m_windows;
     bool m_firstIdle = true;
+    // The last catalog save failed: the next idle pass tries again.
+    bool m_catalogUnsaved = false;
 };

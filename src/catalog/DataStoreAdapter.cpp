@@ -152,9 +152,23 @@ HRESULT DataStoreAdapter::Close() {
 }
 
 HRESULT DataStoreAdapter::Save() {
+    m_saveError.clear();
     if (!IsServiceOpen())
         return E_FAIL;
-    return m_store.SaveIfModified() ? S_OK : E_FAIL;
+    if (m_store.SaveIfModified())
+        return S_OK;
+    m_saveError = m_store.SaveError();
+    return E_FAIL;
+}
+
+HRESULT DataStoreAdapter::GetSaveError(IUnicodeString* path, IUnicodeString* reason) {
+    if (m_saveError.isEmpty())
+        return S_FALSE;
+    if (path != nullptr)
+        path->Assign(m_store.Path());
+    if (reason != nullptr)
+        reason->Assign(m_saveError);
+    return S_OK;
 }
 
 HRESULT DataStoreAdapter::Suspend() {

@@ -27,6 +27,7 @@ public:
     HRESULT Open() override;
     HRESULT Close() override;
     HRESULT Save() override;
+    HRESULT GetSaveError(IUnicodeString* path, IUnicodeString* reason) override;
     HRESULT Suspend() override;
     HRESULT Resume() override;
     HRESULT IsSuspended(int* suspended) override;
@@ -40,4 +41,5 @@ private:
 
     Brindle::Data::XmlAccess::XmlDataStore m_store;
     IDataStoreHost* m_host;
+    QString m_saveError;
 };

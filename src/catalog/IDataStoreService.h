@@ -63,6 +63,10 @@ public:
     // Writes the catalog when it changed since it was loaded or last written, and answers S_OK
     // without writing otherwise; a catalog that failed to load is never written over.
     virtual HRESULT Save() = 0;
+    // After a Save that could not write the file (a full disk, a read-only folder): S_OK, the
+    // catalog file's path and the reason. S_FALSE when the last Save worked or wrote nothing
+    // (suspended, or a catalog that failed to load).
+    virtual HRESULT GetSaveError(IUnicodeString* path, IUnicodeString* reason) = 0;
     // While suspended every catalog operation, Save included, answers E_FAIL.
     virtual HRESULT Suspend() = 0;
     virtual HRESULT Resume() = 0;

@@ -1,5 +1,7 @@
 #include "catalog/XmlDataStoreBase.h"
 
+#include "platform/FileWrite.h"
+
 #include <QByteArrayView>
 #include <QFile>
 #include <QFileInfo>
@@ -41,13 +43,26 @@ class SaveFileWriter final : public pugi::xml_writer {
 public:
     explicit SaveFileWriter(QSaveFile* file) : m_file(file) {}
     void write(const void* data, size_t size) override {
-        const auto length = static_cast<qint64>(size);
-        if (m_file->write(static_cast<const char*>(data), length) != length)
-            m_file->cancelWriting();
+        if (m_error.isEmpty() &&
+            !Platform::WriteAll(*m_file, static_cast<const char*>(data), static_cast<qint64>(size)))
+            Cancel();
     }
+    void Flush() {
+        if (m_error.isEmpty() && !Platform::FlushAll(*m_file))
+            Cancel();
+    }
+    // The first failure's reason: after a cancel the file only says that it was cancelled.
+    const QString& Error() const { return m_error; }
 
 private:
+    void Cancel() {
+        if (m_error.isEmpty())
+            m_error = m_file->errorString();
+        m_file->cancelWriting();
+    }
+
     QSaveFile* m_file;
+    QString m_error;
 };
 
 // The file is written as UTF-16, so its declaration must say so whatever it said when read.
@@ -228,26 +243,30 @@ bool XmlDataStoreBase::LoadFrom(const QString& path) {
 }
 
 bool XmlDataStoreBase::SaveTo(const QString& path) {
+    m_saveError.clear();
     if (path.isEmpty() || !IsSavable())
         return false;
     DeclareUtf16(m_document.get());
     QSaveFile file(path);
-    if (!file.open(QIODevice::WriteOnly))
+    if (!file.open(QIODevice::WriteOnly)) {
+        m_saveError = file.errorString();
         return false;
+    }
     SaveFileWriter writer(&file);
     m_document->save(writer, "\t", pugi::format_default | pugi::format_write_bom,
                      pugi::encoding_utf16_le);
-    // The buffered tail is written by the flush; commit would not see that write fail.
-    if (!file.flush())
-        file.cancelWriting();
-    if (!file.commit())
+    writer.Flush();
+    if (!file.commit()) {
+        m_saveError = writer.Error().isEmpty() ? file.errorString() : writer.Error();
         return false;
+    }
     if (path == m_path)
         m_modified = false;
     return true;
 }
 
 bool XmlDataStoreBase::SaveIfModified() {
+    m_saveError.clear();
     if (!m_modified && IsSavable() && QFileInfo::exists(m_path))
         return true;
     return Save();

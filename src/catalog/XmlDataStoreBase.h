@@ -37,6 +37,8 @@ public:
     // Save, but only when the document changed since it was loaded or last written to its own
     // file (or that file has gone); an unchanged document answers as saved.
     bool SaveIfModified();
+    // Why the last save failed to write its file; empty when it worked or wrote nothing.
+    const QString& SaveError() const { return m_saveError; }
     virtual bool IsOpen() const;
 
     const QString& Path() const { return m_path; }
@@ -62,6 +64,7 @@ private:
     QString m_path;
     bool m_loadFailed = false;
     bool m_modified = false;
+    QString m_saveError;
 };
 
 } // namespace Brindle::Data::XmlAccess

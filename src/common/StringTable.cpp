@@ -104,6 +104,17 @@ const QHash<int, QString>& Table() {
          QStringLiteral("\nQuillmark Ambrel cannot find the file:\n\n\"%s\"")},
         {StringId::FileNotFoundCaption, QStringLiteral("File Not Found")},
         {StringId::ActionFailed, QStringLiteral("Quillmark Ambrel could not complete the action.")},
+        {StringId::CatalogNotSaved,
+         QStringLiteral("Quillmark Ambrel could not save your notebook to the file:\n\n\"%s\"\n\n"
+                        "Your changes are kept while the program runs, and saved as soon as the "
+                        "file can be written again.")},
+        {StringId::SettingsNotSaved,
+         QStringLiteral("Quillmark Ambrel could not save its settings to the file:\n\n\"%s\"\n\n"
+                        "They are saved as soon as the file can be written again.")},
+        {StringId::NoteNotSaved,
+         QStringLiteral("Quillmark Ambrel could not write the new note's file:\n\n\"%s\"\n\n"
+                        "The note was not added.")},
+        {StringId::SaveFailureReason, QStringLiteral("The system reported: %s")},
     };
     return table;
 }

@@ -67,6 +67,10 @@ enum : int {
     FileNotFound = 32982,
     FileNotFoundCaption = 32983,
     ActionFailed = 32984,
+    CatalogNotSaved = 32985,
+    SettingsNotSaved = 32986,
+    NoteNotSaved = 32987,
+    SaveFailureReason = 32988,
 };
 }
 

@@ -3,6 +3,7 @@
 #include "common/StringTable.h"
 #include "libs/toolwell/Formats.h"
 #include "platform/IMessageBox.h"
+#include "platform/SaveFailureNotice.h"
 
 #include <QFileInfo>
 
@@ -34,7 +35,13 @@ int CBasicNoteConstructor::ConstructNote(const QString& noteFilePath, const QStr
         return 0;
     }
     m_creator->SetContent(content);
-    return m_creator->Write() == S_OK ? 1 : 0;
+    Platform::SaveFailureNotice& notice = Platform::SaveFailureNotice::Instance();
+    if (m_creator->Write() != S_OK) {
+        notice.Failed(Platform::SavedFile::Note, noteFilePath, {});
+        return 0;
+    }
+    notice.Saved(Platform::SavedFile::Note);
+    return 1;
 }
 
 int CBasicNoteConstructor::Create(const QString& noteFilePath, const QString& title) {

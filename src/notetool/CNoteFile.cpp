@@ -2,6 +2,7 @@
 
 #include "notes/CHTMLBackgroundStyle.h"
 #include "notes/CNoteDocumentCreator.h"
+#include "platform/FileWrite.h"
 
 #include <QFile>
 #include <QFileInfo>
@@ -195,17 +196,27 @@ CNoteFile::State CNoteFile::Load(NoteContent* content) {
 }
 
 bool CNoteFile::Save(const NoteContent& content) {
+    m_saveError.clear();
     if (!m_writable)
         return false;
     QSaveFile file(m_path);
-    if (!file.open(QIODevice::WriteOnly))
+    if (!file.open(QIODevice::WriteOnly)) {
+        m_saveError = file.errorString();
         return false;
+    }
     const QByteArray bytes = Format(content);
-    if (file.write(bytes) != bytes.size()) {
+    // A small note stays in the write buffer until the flush; commit would not see that write
+    // fail and would put a cut file in place of the note.
+    if (!Platform::WriteAll(file, bytes.constData(), bytes.size()) || !Platform::FlushAll(file)) {
+        m_saveError = file.errorString();
         file.cancelWriting();
         return false;
     }
-    return file.commit();
+    if (!file.commit()) {
+        m_saveError = file.errorString();
+        return false;
+    }
+    return true;
 }
 
 QByteArray CNoteFile::Format(const NoteContent& content) {

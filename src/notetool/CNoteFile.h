@@ -22,6 +22,8 @@ public:
     // False when the file was unreadable, Load was never called, or the write failed (the old
     // file then stays whole).
     bool Save(const NoteContent& content);
+    // Why the last Save failed to write; empty when it worked or wrote nothing.
+    const QString& SaveError() const { return m_saveError; }
 
     // The file's bytes: the note header with the content's font, size and background, the
     // body, UTF-8, one zero byte at the end.
@@ -35,4 +37,5 @@ public:
 private:
     QString m_path;
     bool m_writable = false;
+    QString m_saveError;
 };

@@ -48,7 +48,12 @@ QString CNotePictures::AddImage(const QImage& image) const {
     if (!file.open(QIODevice::WriteOnly))
         return {};
     QImageWriter writer(&file, "png");
-    if (!writer.write(image) || !file.commit())
+    // The picture's tail is written by the flush; commit would not see that write fail.
+    if (!writer.write(image) || !file.flush()) {
+        file.cancelWriting();
+        return {};
+    }
+    if (!file.commit())
         return {};
     return name;
 }

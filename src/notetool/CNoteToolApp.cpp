@@ -170,7 +170,7 @@ bool CNoteToolApp::Save() {
     content.body = m_window->Editor()->BodyHtml();
     if (!m_file.Save(content)) {
         if (m_fileState != CNoteFile::State::Unreadable)
-            m_window->ShowMessage(tr("The note could not be saved."));
+            m_window->ShowMessage(tr("The note could not be saved: %1").arg(m_file.SaveError()));
         return false;
     }
     m_content = content;

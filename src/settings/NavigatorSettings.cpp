@@ -9,6 +9,7 @@
 #include "messaging/CNoteToolService.h"
 #include "messaging/CViewerService.h"
 #include "platform/AppFolders.h"
+#include "platform/FileWrite.h"
 #include "platform/ScreenMetrics.h"
 #include "settings/ISettingsWindow.h"
 #include "settings/StorageRegistry.h"
@@ -182,11 +183,14 @@ bool NavigatorSettings::Load() {
 }
 
 bool NavigatorSettings::Save() {
+    m_saveError.clear();
     const QString folder = Platform::ApplicationDataFolder();
     if (folder.isEmpty())
         return false;
-    if (!QFileInfo(folder).isDir() && !QDir().mkpath(folder))
+    if (!QFileInfo(folder).isDir() && !QDir().mkpath(folder)) {
+        m_saveError = QStringLiteral("The folder could not be made.");
         return false;
+    }
 
     ReleasePtr<DataExchange::IProperties> set(DataExchange::CreateProperties());
     const WindowRect& position = m_record->applicationPosition;
@@ -210,21 +214,30 @@ bool NavigatorSettings::Save() {
     QByteArray bytes(text.size() * 2, Qt::Uninitialized);
     qToLittleEndian<char16_t>(text.utf16(), text.size(), bytes.data());
     QSaveFile file(folder + QStringLiteral("/NavSettings.dat"));
-    if (!file.open(QIODevice::WriteOnly))
+    if (!file.open(QIODevice::WriteOnly)) {
+        m_saveError = file.errorString();
         return false;
-    // The buffered tail is written by the flush; commit would not see that write fail.
-    if (file.write(bytes) != bytes.size() || !file.flush()) {
+    }
+    if (!Platform::WriteAll(file, bytes.constData(), bytes.size()) || !Platform::FlushAll(file)) {
+        m_saveError = file.errorString();
         file.cancelWriting();
         return false;
     }
-    return file.commit();
+    if (!file.commit()) {
+        m_saveError = file.errorString();
+        return false;
+    }
+    return true;
 }
 
-void NavigatorSettings::SaveIfDirty() {
+bool NavigatorSettings::SaveIfDirty() {
     if (!m_dirty)
-        return;
-    Save();
+        return true;
+    // A failed save keeps the change, to be tried again at the next pass.
+    if (!Save())
+        return false;
     m_dirty = false;
+    return true;
 }
 
 void NavigatorSettings::SetDataStoreHost(IDataStoreHost* host) {

@@ -37,9 +37,11 @@ public:
     bool Load();
     // True when the file was written. It is replaced whole or not at all.
     bool Save();
-    // Saves when dirty and clears the flag whatever the save answered, so a failing disk is
-    // tried again at the next change rather than at every idle pass.
-    void SaveIfDirty();
+    // Why the last Save failed; empty when it worked.
+    const QString& SaveError() const { return m_saveError; }
+    // Saves when dirty; answers false when that save failed. The flag is cleared only by a save
+    // that worked, so a change is never dropped: a failing disk is tried again at the next call.
+    bool SaveIfDirty();
     void MarkDirty() { m_dirty = true; }
     bool IsDirty() const { return m_dirty; }
 
@@ -120,6 +122,7 @@ private:
 
     std::unique_ptr<NavigatorSettingsRecord> m_record;
     bool m_dirty = false;
+    QString m_saveError;
     ISettingsWindow* m_frame = nullptr;
     Settings::Bool m_showMessageCentre{QStringLiteral("showmessagecentre"), true};
     Settings::Bool m_keepOnTop{QStringLiteral("keepontop"), false};

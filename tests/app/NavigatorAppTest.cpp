@@ -6,7 +6,9 @@
 #include "settings/NavigatorSettings.h"
 #include "support/AmbrelTest.h"
 #include "support/FakeHarborUtils.h"
+#include "support/FileSizeLimit.h"
 #include "support/FileWatch.h"
+#include "support/RecordingMessageBox.h"
 #include "support/RecordingProcessLauncher.h"
 
 #include <QApplication>
@@ -178,6 +180,58 @@ TEST_F(NavigatorAppTest, TheIdlePassWritesTheCatalogOnlyAfterItChanged) {
         app.ExitInstance();
         ResetSingletons();
     }
+}
+
+TEST_F(NavigatorAppTest, AFullDiskIsToldOncePerFileAndTheSavesAreTriedAgainUntilTheyWork) {
+    CNavigatorApp app({u"ambrel-navigator"_s});
+    ASSERT_TRUE(app.InitInstance());
+    RecordingMessageBox box;
+    Platform::SetMessageBox(&box);
+    app.OnIdle(0);
+    const QByteArray catalog = Read(u"Catalog/catalog.xml"_s);
+    const QByteArray settings = Read(u"NavSettings.dat"_s);
+    ASSERT_FALSE(catalog.isEmpty());
+    ASSERT_FALSE(settings.isEmpty());
+    WNavDS* navigator = WNavDS::Instance();
+    const QString catalogPath = AppDataFolder() + u"/Catalog/catalog.xml"_s;
+    const QString settingsPath = AppDataFolder() + u"/NavSettings.dat"_s;
+
+    // Both files change at every pass, and every save fails.
+    const auto changeAndPass = [&](int round) {
+        navigator->NewFolder(nullptr);
+        app.MainWindow()->move(10 + round, 20);
+        app.OnIdle(0);
+        QCoreApplication::processEvents(); // the posted messages
+    };
+    {
+        const FileSizeLimit full(static_cast<rlim_t>(settings.size() / 2));
+        for (int round = 0; round < 5; ++round)
+            changeAndPass(round);
+    }
+    EXPECT_EQ(Read(u"Catalog/catalog.xml"_s), catalog);
+    EXPECT_EQ(Read(u"NavSettings.dat"_s), settings);
+    EXPECT_EQ(QDir(AppDataFolder()).entryList(QDir::Files), QStringList{u"NavSettings.dat"_s});
+    ASSERT_EQ(box.shown.size(), 2) << "one message for each file";
+    for (const auto& [index, path] : {std::pair{0, catalogPath}, std::pair{1, settingsPath}}) {
+        EXPECT_TRUE(box.shown[index].text.contains(path)) << box.shown[index].text.toStdString();
+        EXPECT_TRUE(box.shown[index].text.contains(u"File too large"_s));
+    }
+    EXPECT_TRUE(NavigatorSettings::Instance()->IsDirty()) << "the settings change was dropped";
+
+    // With room again, the next pass writes both without a new change.
+    app.OnIdle(0);
+    EXPECT_NE(Read(u"Catalog/catalog.xml"_s), catalog) << "the catalog was not tried again";
+    EXPECT_TRUE(ReadSettings().startsWith(u"applicationposition|14,20,"_s));
+
+    // A save that worked lets the next failure be told again.
+    {
+        const FileSizeLimit full(static_cast<rlim_t>(settings.size() / 2));
+        changeAndPass(9);
+        changeAndPass(10);
+    }
+    EXPECT_EQ(box.shown.size(), 4);
+    delete app.MainWindow();
+    app.ExitInstance();
 }
 
 TEST_F(NavigatorAppTest, ClosingTheWindowLeavesNothingRecordedOpen) {

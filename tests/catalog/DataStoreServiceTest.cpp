@@ -275,6 +275,17 @@ TEST_F(DataStoreServiceTest, AFailedSaveLeavesTheOldCatalogWhole) {
     EXPECT_EQ(ReadBytes(m_catalog), old);
     EXPECT_EQ(QDir(QFileInfo(m_catalog).path()).entryList(QDir::Files),
               QStringList{QStringLiteral("catalog.xml")});
+    // The caller learns which file failed and why, to tell the user.
+    QString path;
+    QString reason;
+    UnicodeStringPtr pathSink(&path);
+    UnicodeStringPtr reasonSink(&reason);
+    EXPECT_EQ(Service()->GetSaveError(&pathSink, &reasonSink), S_OK);
+    EXPECT_EQ(path, m_catalog);
+    EXPECT_EQ(reason, QStringLiteral("File too large"));
+
+    ASSERT_EQ(Service()->Save(), S_OK) << "the change waits for the next save";
+    EXPECT_EQ(Service()->GetSaveError(&pathSink, &reasonSink), S_FALSE);
 }
 
 } // namespace

@@ -6,13 +6,16 @@
 #include "notetool/CNoteToolCommandLine.h"
 #include "notetool/CNoteWindow.h"
 #include "support/AmbrelTest.h"
+#include "support/FileSizeLimit.h"
 
 #include <QApplication>
 #include <QClipboard>
+#include <QDir>
 #include <QDropEvent>
 #include <QFile>
 #include <QImage>
 #include <QMimeData>
+#include <QStatusBar>
 #include <QTextCursor>
 #include <QUrl>
 
@@ -165,6 +168,29 @@ TEST_F(NoteFileTest, AFileThatIsNoTextIsShownReadOnlyAndNeverWrittenOver) {
         note->Close();
         EXPECT_EQ(NoteBytes(), bytes);
     }
+}
+
+TEST_F(NoteFileTest, ASaveOnAFullDiskKeepsTheOldNoteWholeAndSaysSo) {
+    WriteNavigatorNote(u"<P>before</P>"_s);
+    const QByteArray old = NoteBytes();
+    std::unique_ptr<CNoteToolApp> note = StartNote();
+    note->Window()->Editor()->setPlainText(u"after"_s);
+    {
+        // Smaller than the note: the new text stays in the write buffer until the commit.
+        const FileSizeLimit full(static_cast<rlim_t>(old.size() / 2));
+        EXPECT_FALSE(note->Save());
+    }
+    EXPECT_EQ(NoteBytes(), old);
+    EXPECT_EQ(QDir(QFileInfo(NotePath()).path()).entryList(QDir::Files | QDir::Hidden),
+              (QStringList{u".keep"_s, u"note.htm"_s}))
+        << "a temporary file was left";
+    const QString message = note->Window()->statusBar()->currentMessage();
+    EXPECT_TRUE(message.startsWith(u"The note could not be saved"_s)) << message.toStdString();
+    EXPECT_TRUE(message.endsWith(u"File too large"_s)) << message.toStdString();
+
+    ASSERT_TRUE(note->Save()) << "the freed disk is written at the next save";
+    EXPECT_TRUE(NoteBytes().contains("after"));
+    note->Close();
 }
 
 TEST_F(NoteFileTest, PastedAndDroppedPicturesAreCopiedBesideTheNoteAndNamedInIt) {

@@ -152,23 +152,31 @@ TEST_F(SettingsFileTest, AStrayLastByteIsDroppedAndAnUnreadableFileKeepsTheDefau
     ExpectDefaults();
 }
 
-TEST_F(SettingsFileTest, SaveIfDirtyWritesOnceAndClearsTheFlagEvenOnFailure) {
-    Settings()->SaveIfDirty();
+TEST_F(SettingsFileTest, SaveIfDirtyKeepsAChangeThatFailedToSaveUntilASaveWorks) {
+    EXPECT_TRUE(Settings()->SaveIfDirty());
     EXPECT_FALSE(QFile::exists(FilePath())) << "nothing to save";
 
     Settings()->SetKeepOnTop(true);
     EXPECT_TRUE(Settings()->IsDirty());
-    Settings()->SaveIfDirty();
+    EXPECT_TRUE(Settings()->SaveIfDirty());
     EXPECT_FALSE(Settings()->IsDirty());
     EXPECT_TRUE(FileBytes().contains(Utf16Le(u"keepontop|true|")));
 
-    // A file where the folder belongs: the save fails, silently.
+    // A file where the folder belongs: every save fails, and the change waits.
     ASSERT_TRUE(QDir(DataHome() + QStringLiteral("/Brindle")).removeRecursively());
     WriteFile(QStringLiteral("data/Brindle"), "blocks the folder");
-    EXPECT_FALSE(Settings()->Save());
     Settings()->SetShowFrame(false);
-    Settings()->SaveIfDirty();
+    for (int pass = 0; pass < 3; ++pass) {
+        EXPECT_FALSE(Settings()->SaveIfDirty());
+        EXPECT_TRUE(Settings()->IsDirty()) << "the change was dropped";
+        EXPECT_FALSE(Settings()->SaveError().isEmpty());
+    }
+
+    ASSERT_TRUE(QFile::remove(DataHome() + QStringLiteral("/Brindle")));
+    EXPECT_TRUE(Settings()->SaveIfDirty());
     EXPECT_FALSE(Settings()->IsDirty());
+    EXPECT_TRUE(Settings()->SaveError().isEmpty());
+    EXPECT_TRUE(FileBytes().contains(Utf16Le(u"showframe|false|")));
 }
 
 TEST_F(SettingsFileTest, AFailedSaveLeavesTheOldFileWhole) {
@@ -178,6 +186,7 @@ TEST_F(SettingsFileTest, AFailedSaveLeavesTheOldFileWhole) {
     {
         const FileSizeLimit full(old.size() + 8);
         EXPECT_FALSE(Settings()->Save());
+        EXPECT_EQ(Settings()->SaveError(), QStringLiteral("File too large"));
     }
     EXPECT_EQ(FileBytes(), old);
     EXPECT_EQ(QDir(AppDataFolder()).entryList(QDir::Files),

@@ -14,6 +14,7 @@
 #include "platform/IProcessLauncher.h"
 #include "platform/IWaitCursor.h"
 #include "platform/Registry.h"
+#include "platform/SaveFailureNotice.h"
 #include "settings/NavigatorSettings.h"
 
 #include <QDir>
@@ -25,6 +26,7 @@ void ResetSingletons() {
     ReleaseHarborUtilsInterface();
     SetHarborUtilsForTesting(nullptr);
     Platform::SetMessageBox(nullptr);
+    Platform::SaveFailureNotice::DestroyInstance();
     Platform::SetWaitCursor(nullptr);
     Platform::SetProcessLauncher(nullptr);
     Platform::Registry::SetMachineFile({});

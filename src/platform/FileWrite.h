@@ -1,0 +1,18 @@
+#pragma once
+
+#include <QtGlobal>
+
+class QFileDevice;
+
+namespace Platform {
+
+// Writing that keeps the system's reason when it fails. A write cut short by a full disk or a
+// file size limit leaves no reason in the file's errorString(), so the rest is tried once more:
+// that attempt fails at once, with the reason.
+
+// Writes all size bytes; false when they could not all be written.
+bool WriteAll(QFileDevice& file, const char* data, qint64 size);
+// Writes out what the file still buffers: commit and close would not see that write fail.
+bool FlushAll(QFileDevice& file);
+
+} // namespace Platform
