@@ -26,6 +26,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstdio>
 
 namespace {
 
@@ -226,7 +227,16 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         service->Save();
     }
     FuzzEnvironment::ResetProgram();
-    FuzzEnvironment::Require(Outside() == g_outside,
+    const QStringList outside = Outside();
+    if (outside != g_outside) {
+        for (const QString& entry : g_outside)
+            if (!outside.contains(entry))
+                std::fprintf(stderr, "before: %s\n", qPrintable(entry));
+        for (const QString& entry : outside)
+            if (!g_outside.contains(entry))
+                std::fprintf(stderr, "after:  %s\n", qPrintable(entry));
+    }
+    FuzzEnvironment::Require(outside == g_outside,
                              "nothing outside the data folder was created, changed or removed");
     return 0;
 }
