@@ -13,6 +13,7 @@
 #include "platform/IForeignWindows.h"
 #include "platform/IMessageBox.h"
 #include "platform/IProcessLauncher.h"
+#include "platform/Registry.h"
 #include "support/RecordingForeignWindows.h"
 #include "support/RecordingItemWindowHub.h"
 #include "support/RecordingMessageBox.h"
@@ -120,10 +121,12 @@ void WriteNotebook() {
                                    QByteArrayLiteral("<HTML><BODY><DIV>text</DIV></BODY></HTML>"));
 }
 
-// Every file and folder of the home outside the data folder, with size and time of change.
+// Every file and folder of the home outside the data folder and the program's registry file,
+// with size and time of change.
 QStringList Outside() {
     QStringList entries;
     const QString data = FuzzEnvironment::AppDataFolder();
+    const QString registry = Platform::Registry::UserFile();
     QDirIterator it(FuzzEnvironment::Home(),
                     QDir::AllEntries | QDir::NoDotAndDotDot | QDir::Hidden | QDir::System,
                     QDirIterator::Subdirectories);
@@ -131,6 +134,9 @@ QStringList Outside() {
         const QFileInfo info = it.nextFileInfo();
         const QString path = info.filePath();
         if (path == data || path.startsWith(data + u'/') || data.startsWith(path + u'/'))
+            continue;
+        // The program's own registry file (the recent items live there) and its folders.
+        if (path == registry || registry.startsWith(path + u'/'))
             continue;
         entries.append(QStringLiteral("%1 %2 %3")
                            .arg(path)
