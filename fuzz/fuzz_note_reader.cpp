@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstdio>
 
 extern "C" int LLVMFuzzerInitialize(int* argc, char*** argv) {
     FuzzEnvironment::SetUp(argc, argv, FuzzEnvironment::Application::Core);
@@ -19,7 +20,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const QByteArray saved = CNoteFile::Format(read);
     NoteContent reread;
     FuzzEnvironment::Require(CNoteFile::Parse(saved, &reread), "a saved note reads again");
-    FuzzEnvironment::Require(CNoteFile::Format(reread) == saved,
-                             "a note saved twice is the same file");
+    const QByteArray savedAgain = CNoteFile::Format(reread);
+    if (savedAgain != saved)
+        std::fprintf(stderr, "saved:\n%s\nsaved again:\n%s\n", saved.constData(),
+                     savedAgain.constData());
+    FuzzEnvironment::Require(savedAgain == saved, "a note saved twice is the same file");
     return 0;
 }

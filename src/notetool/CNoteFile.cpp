@@ -126,12 +126,16 @@ bool ReadNumber(const QString& text, QLatin1StringView unit, std::uint32_t* valu
 }
 
 void ReadBackground(const QString& value, NoteContent* content) {
-    CHTMLBackgroundStyle style(content->backgroundColor, {}, 0, 0, 0, 0);
-    style.Parse(value);
-    style.GetColor(&content->backgroundColor);
     const qsizetype url = value.indexOf("url("_L1, 0, Qt::CaseInsensitive);
+    const qsizetype close = value.lastIndexOf(u')');
+    // The colour is read outside the picture's path, which may hold anything.
+    QString outside = value;
+    if (url >= 0)
+        outside = value.left(url) + (close > url ? value.mid(close + 1) : QString());
+    CHTMLBackgroundStyle style(content->backgroundColor, {}, 0, 0, 0, 0);
+    style.Parse(outside);
+    style.GetColor(&content->backgroundColor);
     if (url >= 0) {
-        const qsizetype close = value.lastIndexOf(u')');
         QString image = close > url ? value.mid(url + 4, close - url - 4) : value.mid(url + 4);
         // The header writes one blank on each side of the picture's path.
         if (image.startsWith(u' '))

@@ -140,18 +140,33 @@ TEST_F(NoteFileTest, DamagedOrForeignFilesOpenAsFarAsTheyCanBeRead) {
     }
 }
 
-TEST_F(NoteFileTest, ANoteWithAnEmptyFontKeepsItsFontWhenSavedAgain) {
-    // An empty font name names no font: the note keeps the font it has, and a second save
-    // writes the same file as the first.
-    NoteContent read;
-    ASSERT_TRUE(CNoteFile::Parse("<HTML><HEAD><STYLE> BODY { FONT-FAMILY : ;FONT-SIZE : 9 pt; } "
-                                 "</STYLE></HEAD><BODY><DIV>x</DIV></BODY></HTML>",
-                                 &read));
-    EXPECT_EQ(read.fontFamily, u"Times New Roman"_s);
-    const QByteArray saved = CNoteFile::Format(read);
-    NoteContent reread;
-    ASSERT_TRUE(CNoteFile::Parse(saved, &reread));
-    EXPECT_EQ(CNoteFile::Format(reread), saved);
+TEST_F(NoteFileTest, OddHeadersReadAsTheyAreMeantAndSaveTheSameEveryTime) {
+    struct Row {
+        QByteArray style;
+        QString fontFamily;
+        std::uint32_t backgroundColor;
+        QString backgroundImage;
+    };
+    const Row rows[] = {
+        // An empty font name names no font: the note keeps the font it has.
+        {"BODY { FONT-FAMILY : ;FONT-SIZE : 9 pt; }", u"Times New Roman"_s, 0x00FFFFFF, u"none"_s},
+        // A colour written in the picture's path is part of the path, not the note's colour.
+        {"BODY { BACKGROUND : #102030 url( /p/paper #e0e0ff.png ) repeat; }", u"Times New Roman"_s,
+         0x00302010, u"/p/paper #e0e0ff.png"_s},
+    };
+    for (const Row& row : rows) {
+        NoteContent read;
+        ASSERT_TRUE(CNoteFile::Parse("<HTML><HEAD><STYLE> " + row.style +
+                                         " </STYLE></HEAD><BODY><DIV>x</DIV></BODY></HTML>",
+                                     &read));
+        EXPECT_EQ(read.fontFamily, row.fontFamily) << row.style.constData();
+        EXPECT_EQ(read.backgroundColor, row.backgroundColor) << row.style.constData();
+        EXPECT_EQ(read.backgroundImage, row.backgroundImage) << row.style.constData();
+        const QByteArray saved = CNoteFile::Format(read);
+        NoteContent reread;
+        ASSERT_TRUE(CNoteFile::Parse(saved, &reread));
+        EXPECT_EQ(CNoteFile::Format(reread), saved) << row.style.constData();
+    }
 }
 
 TEST_F(NoteFileTest, AFileThatIsNoTextIsShownReadOnlyAndNeverWrittenOver) {
