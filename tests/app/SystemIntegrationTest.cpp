@@ -41,14 +41,6 @@ TEST_F(SystemIntegrationTest, TheBrowserEntryIsWrittenOnceAndNeverRewritten) {
               u"/opt/first/QMAmbrelCopyToNote.hta"_s);
 }
 
-TEST_F(SystemIntegrationTest, TheStartPanelLaunchesUnlessItSaidNo) {
-    EXPECT_TRUE(IsStartPanelLaunchOnStart()) << "no choice made yet";
-    SetStartPanelLaunchOnStart(false);
-    EXPECT_FALSE(IsStartPanelLaunchOnStart());
-    SetStartPanelLaunchOnStart(true);
-    EXPECT_TRUE(IsStartPanelLaunchOnStart());
-}
-
 TEST_F(SystemIntegrationTest, TheActivityCentreStartsOnlyWhenItsFileExists) {
     RecordingProcessLauncher launcher;
     Platform::SetProcessLauncher(&launcher);

@@ -1,6 +1,5 @@
 #include "common/ReleasePtr.h"
 #include "dataexchange/CBasicStringIDReporter.h"
-#include "dataexchange/CRecursiveChildrenReporter.h"
 #include "dataexchange/WStringIDs.h"
 #include "support/AmbrelTest.h"
 
@@ -26,15 +25,6 @@ TEST(StringIDsTest, ReportsInInsertionOrderKeepingDuplicates) {
               (QStringList{QStringLiteral("b"), QStringLiteral("a"), QStringLiteral("b"), {}}));
     AnsweringReporter answering;
     EXPECT_EQ(list->ReportStringIDs(&answering), 4) << "the last call's answer";
-}
-
-TEST(StringIDsTest, RecursiveChildrenReporterNeverSkips) {
-    CRecursiveChildrenReporter reporter;
-    IDataStoreReporter& walk = reporter;
-    EXPECT_EQ(walk.ReportItem(QStringLiteral("A")), S_OK);
-    EXPECT_EQ(walk.SkipChildren(), 0);
-    EXPECT_EQ(walk.ReportItem(QStringLiteral("B")), S_OK);
-    EXPECT_EQ(reporter.Items(), (QStringList{QStringLiteral("A"), QStringLiteral("B")}));
 }
 
 } // namespace

@@ -1,8 +1,7 @@
-#include "support/NavigatorProcess.h"
 #include "support/AmbrelTest.h"
+#include "support/FakeNavigatorBroker.h"
+#include "support/NavigatorProcess.h"
 
-#include <QCoreApplication>
-#include <QDeadlineTimer>
 #include <QDir>
 #include <QFile>
 #include <QThread>
@@ -31,16 +30,9 @@ protected:
             QDir(CatalogFolder()).entryList(QDir::Dirs | QDir::NoDotAndDotDot).size());
     }
 
-    template <class Condition> static bool WaitFor(Condition condition, int timeoutMs = 10000) {
-        const QDeadlineTimer deadline(timeoutMs);
-        while (!condition()) {
-            if (deadline.hasExpired())
-                return false;
-            // The processes' states are only brought up to date by their events.
-            QCoreApplication::processEvents();
-            QThread::msleep(20);
-        }
-        return true;
+    // The processes' states are only brought up to date by their events.
+    static bool WaitFor(const std::function<bool()>& condition, int timeoutMs = 10000) {
+        return WaitForEvents(condition, timeoutMs);
     }
 };
 

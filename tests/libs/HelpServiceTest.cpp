@@ -1,6 +1,5 @@
 #include "RecordingUrlHandler.h"
 #include "ServicesTestSupport.h"
-#include "support/RecordingMessageBox.h"
 
 #include "libs/toolwell/CHelpService.h"
 #include "platform/Registry.h"
@@ -59,17 +58,6 @@ TEST_F(HelpServiceTest, WebsiteIsOnlyAWebAddressFromTheMachineSettings) {
     ASSERT_EQ(help->OpenWebsite(), S_OK);
     EXPECT_EQ(browser.opened,
               QList<QUrl>{QUrl(QStringLiteral("https://www.example.com/ambrel?from=navigator"))});
-}
-
-TEST_F(HelpServiceTest, AboutShowsNameVersionAndLicence) {
-    RecordingMessageBox box;
-    Platform::SetMessageBox(&box);
-    ASSERT_EQ(GetHelpService()->ShowAbout(), S_OK);
-    ASSERT_EQ(box.shown.size(), 1);
-    EXPECT_EQ(box.shown[0].caption, QStringLiteral("About Quillmark Ambrel"));
-    EXPECT_EQ(box.shown[0].style, 0x40u);
-    for (const char* part : {"Quillmark Ambrel\n", "Version 1.0.0.521\n", "licensed"})
-        EXPECT_TRUE(box.shown[0].text.contains(QString::fromUtf8(part))) << part;
 }
 
 } // namespace

@@ -17,7 +17,7 @@ protected:
 
     // The arguments of the one mail program run since the last call.
     QStringList TakeArguments() const {
-        if (!WaitFor([this] { return QFile::exists(Record()); }))
+        if (!WaitForEvents([this] { return QFile::exists(Record()); }))
             return {QStringLiteral("(the mail program did not run)")};
         QStringList arguments = QString::fromUtf8(ReadAll(Record())).split(QChar(0));
         arguments.removeLast();

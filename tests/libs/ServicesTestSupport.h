@@ -1,13 +1,11 @@
 #pragma once
 
 #include "support/AmbrelTest.h"
+#include "support/FakeNavigatorBroker.h"
 #include "support/RecordingProcessLauncher.h"
 
-#include <QCoreApplication>
-#include <QDeadlineTimer>
 #include <QDir>
 #include <QFile>
-#include <QThread>
 
 #include <functional>
 
@@ -41,16 +39,6 @@ protected:
 
     QStringList TempEntries() const {
         return QDir(TempFolder()).entryList(QDir::AllEntries | QDir::NoDotAndDotDot);
-    }
-
-    // Runs the event loop until `done` holds or five seconds passed; answers `done`.
-    static bool WaitFor(const std::function<bool()>& done) {
-        const QDeadlineTimer deadline(5000);
-        while (!done() && !deadline.hasExpired()) {
-            QCoreApplication::processEvents(QEventLoop::AllEvents, 10);
-            QThread::msleep(5);
-        }
-        return done();
     }
 
     static QByteArray ReadAll(const QString& path) {

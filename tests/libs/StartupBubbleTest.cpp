@@ -22,7 +22,7 @@ protected:
             QStringLiteral("org.freedesktop.Notifications"),
             QStringLiteral("/org/freedesktop/Notifications"),
             QStringLiteral("org.freedesktop.Notifications"), QStringLiteral("GetCapabilities")));
-        return WaitFor([&] { return service.capabilityQuestions > before; });
+        return WaitForEvents([&] { return service.capabilityQuestions > before; });
     }
 };
 
@@ -42,7 +42,7 @@ TEST_F(StartupBubbleTest, BubbleIsShownOnceAndOnlyByANotificationService) {
     FakeNotificationService service;
     ASSERT_TRUE(service.registered);
     utils.SetNavigatorRect(window);
-    ASSERT_TRUE(WaitFor([&] { return !service.shown.isEmpty(); }));
+    ASSERT_TRUE(WaitForEvents([&] { return !service.shown.isEmpty(); }));
     EXPECT_EQ(service.shown[0].appName, QStringLiteral("Quillmark Ambrel"));
     EXPECT_EQ(service.shown[0].summary, QStringLiteral("Quillmark Ambrel is running"));
     EXPECT_TRUE(service.shown[0].body.contains(QStringLiteral("at the top right of your screen")))
@@ -57,7 +57,7 @@ TEST_F(StartupBubbleTest, BubbleIsShownOnceAndOnlyByANotificationService) {
 
     utils.SetStartupBubbleEnabled(true);
     utils.SetNavigatorRect(window);
-    EXPECT_TRUE(WaitFor([&] { return service.shown.size() == 2; }));
+    EXPECT_TRUE(WaitForEvents([&] { return service.shown.size() == 2; }));
 }
 
 TEST_F(StartupBubbleTest, DelayComesFromTheMachineSettingsOrIsTwoMinutes) {

@@ -5,13 +5,13 @@
 #include "messaging/CNavInstanceMgr.h"
 #include "messaging/INoteToolService.h"
 #include "messaging/IViewerService.h"
+#include "support/FakeNavigatorBroker.h"
 
 #include <QDBusConnection>
 #include <QDBusConnectionInterface>
 #include <QDBusMessage>
 #include <QDBusMetaType>
 #include <QDialog>
-#include <QEventLoop>
 #include <QTimer>
 
 #include <functional>
@@ -58,21 +58,6 @@ private:
 public:
     QDBusConnection bus;
 };
-
-// Runs the event loop until the condition holds or two seconds have passed.
-bool WaitFor(const std::function<bool()>& condition) {
-    QEventLoop loop;
-    QTimer poll;
-    QObject::connect(&poll, &QTimer::timeout, &loop, [&] {
-        if (condition())
-            loop.quit();
-    });
-    QTimer::singleShot(2000, &loop, &QEventLoop::quit);
-    poll.start(10);
-    if (!condition())
-        loop.exec();
-    return condition();
-}
 
 class MessageDispatchTest : public NavigatorModelFixture {
 protected:
@@ -284,25 +269,25 @@ TEST_F(MessageDispatchTest, WindowRequestsGoToTheOwningProgramOnlyAndItsLeavingC
     peer->Post(u"WindowShowNotification"_s, {{u"WindowShowCmdType"_s, u"windowshowminimize"_s}});
     const Props minimise{
         {u"handle"_s, u"7"_s}, {u"command"_s, u"show"_s}, {u"showcommand"_s, u"6"_s}};
-    ASSERT_TRUE(WaitFor([&] { return !peer->heard.isEmpty(); }));
+    ASSERT_TRUE(WaitForEvents([&] { return !peer->heard.isEmpty(); }, 2000));
     EXPECT_EQ(peer->heard.first(), std::make_pair(u"WindowCommand"_s, minimise));
     // What one sender sends reaches a listener in order: a command for the bystander would
     // come before this notification to everyone.
     GetItemWindowHub()->PrintNote(note);
-    ASSERT_TRUE(WaitFor([&] { return !bystander.heard.isEmpty(); }));
+    ASSERT_TRUE(WaitForEvents([&] { return !bystander.heard.isEmpty(); }, 2000));
     EXPECT_EQ(bystander.heard.first().first, u"PrintNote"_s) << "a command is for its owner only";
 
     IViewerService* viewer = WNavDS::Instance()->GetViewerService();
     INoteToolService* noteTool = WNavDS::Instance()->GetNoteToolService();
     ASSERT_EQ(WindowCount(viewer), 1);
     peer->Leave();
-    EXPECT_TRUE(WaitFor([&] { return WindowCount(noteTool) == 0; }));
+    EXPECT_TRUE(WaitForEvents([&] { return WindowCount(noteTool) == 0; }, 2000));
     EXPECT_EQ(WindowCount(viewer), 1) << "the other program's window stays";
 }
 
 TEST_F(MessageDispatchTest, HubNotificationsAndNewNoteTravelOverTheBus) {
     GetItemWindowHub()->ActivateNote(note);
-    ASSERT_TRUE(WaitFor([&] { return !peer->heard.isEmpty(); }));
+    ASSERT_TRUE(WaitForEvents([&] { return !peer->heard.isEmpty(); }, 2000));
     EXPECT_EQ(peer->heard.first(), std::make_pair(u"ActivateNote"_s, Props{{u"itemid"_s, note}}));
 
     const qsizetype before = WNavDS::Instance()->GetItems().size();

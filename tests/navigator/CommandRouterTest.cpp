@@ -35,11 +35,9 @@ TEST_F(CommandRouterTest, IdsReachTheirOperationsEnabledByTheSelectionAndUnknown
                 << row.id << " " << selected.toStdString();
             QAction* action = router->Action(row.id);
             EXPECT_EQ(action->isEnabled(), expected) << row.id;
-            EXPECT_EQ(action->data().toInt(), row.id);
         }
     }
     EXPECT_FALSE(router->Execute(12345));
-    EXPECT_EQ(router->Action(32858)->text(), u"Delete"_s);
 
     // Through the shared entries: delete, then restore, then rename in the tree.
     model->SelectById(note);

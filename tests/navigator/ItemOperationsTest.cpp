@@ -111,7 +111,8 @@ TEST_F(ItemOperationsTest, LinkingAFileTheCatalogHoldsOpensTheExistingEntry) {
     EXPECT_EQ(model->GetItems().size(), count + 1);
 }
 
-TEST_F(ItemOperationsTest, TheLinkedDocumentsLimitKeepsTheMostRecentAndAtLeastOne) {
+TEST_F(ItemOperationsTest,
+       TheLinkedDocumentsLimitKeepsTheMostRecentTheEarlierOfEqualAndAtLeastOne) {
     NavigatorSettings::Instance()->SetMaxLinkedDocuments(2);
     const QString t1 = Linked(u"/d/1.pdf"_s, 1000);
     const QString t3 = Linked(u"/d/3.pdf"_s, 3000);
@@ -126,23 +127,23 @@ TEST_F(ItemOperationsTest, TheLinkedDocumentsLimitKeepsTheMostRecentAndAtLeastOn
 
     // A newly linked file is the most recent: it stays, and the oldest goes.
     model->LinkDocument(WriteFile(u"new.pdf"_s, "%PDF"), false);
-    EXPECT_EQ(model->GetSelected()->GetParent(), model->GetLinkedDocuments());
+    const QString newest = model->GetSelected()->GetItemId();
+    EXPECT_EQ(Item(newest)->GetParent(), model->GetLinkedDocuments());
     EXPECT_EQ(Item(t2), nullptr);
-}
 
-TEST_F(ItemOperationsTest, AmongEqualTimesTheEarlierStaysAndALimitOfZeroKeepsOne) {
+    // Among equal times the earlier in the list stays; a limit of zero still keeps one.
     const QString a = Linked(u"/d/a.pdf"_s, 500);
     const QString b = Linked(u"/d/b.pdf"_s, 500);
-    const QString c = Linked(u"/d/c.pdf"_s, 500);
-    NavigatorSettings::Instance()->SetMaxLinkedDocuments(2);
-    WNavDS* model = Load();
-    model->EnforceLinkedLimit();
-    EXPECT_NE(Item(b), nullptr);
-    EXPECT_EQ(Item(c), nullptr);
-    NavigatorSettings::Instance()->SetMaxLinkedDocuments(0);
+    model->Load();
+    NavigatorSettings::Instance()->SetMaxLinkedDocuments(3);
     model->EnforceLinkedLimit();
     EXPECT_NE(Item(a), nullptr);
     EXPECT_EQ(Item(b), nullptr);
+    NavigatorSettings::Instance()->SetMaxLinkedDocuments(0);
+    model->EnforceLinkedLimit();
+    EXPECT_NE(Item(newest), nullptr);
+    EXPECT_EQ(Item(t3), nullptr);
+    EXPECT_EQ(Item(a), nullptr);
 }
 
 TEST_F(ItemOperationsTest, DeletingAFolderClosesItsContentsAndRestoreBringsItBack) {

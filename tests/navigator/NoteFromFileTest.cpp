@@ -1,8 +1,5 @@
 #include "NavigatorModelFixture.h"
 
-#include "notes/CBasicNoteConstructor.h"
-#include "notes/NoteConstructorRegistry.h"
-
 #include <QDir>
 #include <QFile>
 
@@ -61,28 +58,6 @@ TEST_F(NoteFromFileTest, AFileThatCannotBecomeANoteIsKeptAndLeavesNothingBehind)
     EXPECT_EQ(model->AddNoteFromFile(page, nullptr), E_FAIL);
     EXPECT_TRUE(QFile::exists(page));
     EXPECT_EQ(messages.shown.size(), 1);
-}
-
-TEST_F(NoteFromFileTest, ADroppedPictureLandsOnTheDropTargetUnopenedAndTheFileStays) {
-    const QString folder = Folder();
-    const QString other = Folder();
-    WNavDS* model = Load();
-    model->SelectItem(Item(other));
-    model->SetDropTarget(Item(folder));
-    const QString picture = WriteFile(u"in/photo.png"_s, "not really a png");
-
-    ReleasePtr<CBasicNoteConstructor> constructor(CreateNoteConstructor(picture));
-    ASSERT_TRUE(constructor);
-    QString itemId;
-    UnicodeStringPtr idSink(&itemId);
-    ASSERT_EQ(model->AddNoteFromConstructor(u"photo.png"_s, constructor.get(), 0, 2, &idSink),
-              S_OK);
-    EXPECT_EQ(Item(itemId)->GetParent(), Item(folder));
-    EXPECT_EQ(CatalogValue(itemId, u"open"_s), u"false"_s);
-    EXPECT_TRUE(QFile::exists(picture));
-    EXPECT_TRUE(QFile::exists(ItemFile(itemId, u"photo.png"_s)));
-    EXPECT_TRUE(Read(ItemFile(itemId)).contains("photo.png"));
-    EXPECT_TRUE(launcher.starts.isEmpty());
 }
 
 } // namespace

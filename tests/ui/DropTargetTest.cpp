@@ -141,7 +141,7 @@ private:
 
 TEST_F(DropTargetTest, DroppedFilesLandOnTheDropTargetAsNotesAndLinkedDocuments) {
     const QString text = WriteFile(u"in/a.txt"_s, "meeting minutes");
-    WriteFile(u"in/b.jpg"_s, "picture bytes");
+    const QString picture = WriteFile(u"in/b.jpg"_s, "picture bytes");
     // A name with blanks, quotes and letters beyond ASCII, as a file manager encodes it.
     const QString pdf = WriteFile(u"in/Q3 r\u00E9port 'x'.PDF"_s, "%PDF");
     QMimeData data;
@@ -164,7 +164,8 @@ TEST_F(DropTargetTest, DroppedFilesLandOnTheDropTargetAsNotesAndLinkedDocuments)
     }
     EXPECT_TRUE(NoteFile(dropped[0]).contains("meeting minutes"));
     EXPECT_TRUE(QFile::exists(ItemFile(dropped[1]->GetItemId(), u"b.jpg"_s)));
-    EXPECT_TRUE(QFile::exists(text)) << "a dropped file is the user's and stays";
+    for (const QString& source : {text, picture, pdf})
+        EXPECT_TRUE(QFile::exists(source)) << "a dropped file is the user's and stays";
 
     // A document dropped into the notebook joins it: the model copies the linked file in.
     const QString documentId = dropped[2]->GetItemId();
