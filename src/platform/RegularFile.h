@@ -2,6 +2,7 @@
 
 #include <QString>
 
+class QByteArray;
 class QFile;
 
 namespace Platform {
@@ -16,5 +17,13 @@ bool OpenRegularFile(QFile& file, const QString& path);
 // Copies the regular file at source to a new file target; false when the source is not a
 // regular file, the target exists or the copy fails (a partial target is removed).
 bool CopyRegularFile(const QString& source, const QString& target);
+
+// What CreateFileWhole did.
+enum class WholeFileResult { Created, NameTaken, Failed };
+
+// Makes a new file at path holding exactly bytes. The name appears only once the file is
+// complete, so a crash or a failed write leaves no file, nor a cut-off one, under it. An
+// existing entry of that name (a dangling link too) is never written over nor followed.
+WholeFileResult CreateFileWhole(const QString& path, const QByteArray& bytes);
 
 } // namespace Platform
