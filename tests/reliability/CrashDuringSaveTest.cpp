@@ -334,7 +334,6 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
     CompanionBus bus;
     ASSERT_TRUE(bus.IsConnected());
     const int kills = Reliability::Rounds(8, 200);
-        qEnvironmentVariableIntValue("KILLS") ? qEnvironmentVariableIntValue("KILLS") : 8, 200);
         int insideSave = 0;
         int beforeStates = 0;
         int afterStates = 0;
