@@ -6,6 +6,7 @@
 
 #include <cerrno>
 #include <cstdlib>
+#include <functional>
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -15,9 +16,10 @@ namespace Platform {
 
 namespace {
 
-bool WriteAll(int fd, const QByteArray& bytes) {
-    const char* at = bytes.constData();
-    qsizetype left = bytes.size();
+// Writes out what fill writes to fd, and makes it durable.
+using Filler = std::function<bool(int fd)>;
+
+bool WriteAll(int fd, const char* at, qsizetype left) {
     while (left > 0) {
         const ssize_t written = ::write(fd, at, static_cast<size_t>(left));
         if (written < 0 && errno == EINTR)
@@ -27,7 +29,11 @@ bool WriteAll(int fd, const QByteArray& bytes) {
         at += written;
         left -= written;
     }
-    return ::fdatasync(fd) == 0;
+    return true;
+}
+
+bool Fill(int fd, const Filler& fill) {
+    return fill(fd) && ::fdatasync(fd) == 0;
 }
 
 WholeFileResult LinkResult(bool linked, int error) {
@@ -39,16 +45,43 @@ WholeFileResult LinkResult(bool linked, int error) {
 // Where the folder's file system has no unnamed files: a hidden named one, linked to its name
 // and then removed. Only a crash between its creation and its removal leaves it behind.
 WholeFileResult CreateThroughNamedFile(const QByteArray& folder, const QByteArray& target,
-                                       const QByteArray& bytes) {
+                                       const Filler& fill) {
     QByteArray temporary = folder + "/.ambrel-new-XXXXXX";
     const int fd = ::mkostemp(temporary.data(), O_CLOEXEC);
     if (fd < 0)
         return WholeFileResult::Failed;
-    const bool written = WriteAll(fd, bytes);
+    const bool written = Fill(fd, fill);
     ::close(fd);
     const bool linked = written && ::link(temporary.constData(), target.constData()) == 0;
     const int error = written && !linked ? errno : 0;
     ::unlink(temporary.constData());
+    return LinkResult(linked, error);
+}
+
+// An unnamed file in the target's folder, given its name by linking it in once complete: the
+// link fails when the name exists, and a crash before it leaves nothing at all.
+WholeFileResult CreateWhole(const QString& path, const Filler& fill) {
+    const QFileInfo info(path);
+    const QByteArray folder = QFile::encodeName(info.absolutePath());
+    const QByteArray target = QFile::encodeName(info.absoluteFilePath());
+    const int fd = ::open(folder.constData(), O_TMPFILE | O_WRONLY | O_CLOEXEC, 0666);
+    if (fd < 0) {
+        if (errno != EOPNOTSUPP && errno != EISDIR && errno != EINVAL)
+            return WholeFileResult::Failed;
+        return CreateThroughNamedFile(folder, target, fill);
+    }
+    if (!Fill(fd, fill)) {
+        ::close(fd);
+        return WholeFileResult::Failed;
+    }
+    const QByteArray self = "/proc/self/fd/" + QByteArray::number(fd);
+    const bool linked =
+        ::linkat(AT_FDCWD, self.constData(), AT_FDCWD, target.constData(), AT_SYMLINK_FOLLOW) == 0;
+    const int error = errno;
+    ::close(fd);
+    // Without /proc the unnamed file cannot be named.
+    if (!linked && error == ENOENT && ::access("/proc/self/fd", F_OK) != 0)
+        return CreateThroughNamedFile(folder, target, fill);
     return LinkResult(linked, error);
 }
 
@@ -73,48 +106,21 @@ bool CopyRegularFile(const QString& source, const QString& target) {
     QFile in;
     if (!OpenRegularFile(in, source))
         return false;
-    QFile out(target);
-    if (!out.open(QIODevice::WriteOnly | QIODevice::NewOnly))
-        return false;
-    constexpr qint64 kChunk = 1 << 16;
-    QByteArray chunk;
-    bool ok = true;
-    while (ok && !in.atEnd()) {
-        chunk = in.read(kChunk);
-        ok = !chunk.isEmpty() && out.write(chunk) == chunk.size();
-    }
-    ok = ok && out.flush();
-    out.close();
-    if (!ok)
-        QFile::remove(target);
-    return ok;
+    // A copy cut off by a crash would later pass for the whole one: it appears only complete.
+    return CreateWhole(target, [&in](int fd) {
+               constexpr qint64 kChunk = 1 << 16;
+               while (!in.atEnd()) {
+                   const QByteArray chunk = in.read(kChunk);
+                   if (chunk.isEmpty() || !WriteAll(fd, chunk.constData(), chunk.size()))
+                       return false;
+               }
+               return in.error() == QFileDevice::NoError;
+           }) == WholeFileResult::Created;
 }
 
 WholeFileResult CreateFileWhole(const QString& path, const QByteArray& bytes) {
-    const QFileInfo info(path);
-    const QByteArray folder = QFile::encodeName(info.absolutePath());
-    const QByteArray target = QFile::encodeName(info.absoluteFilePath());
-    // An unnamed file in the same folder, given its name by linking it in: the link fails
-    // when the name exists, and a crash before it leaves nothing at all.
-    const int fd = ::open(folder.constData(), O_TMPFILE | O_WRONLY | O_CLOEXEC, 0666);
-    if (fd < 0) {
-        if (errno != EOPNOTSUPP && errno != EISDIR && errno != EINVAL)
-            return WholeFileResult::Failed;
-        return CreateThroughNamedFile(folder, target, bytes);
-    }
-    if (!WriteAll(fd, bytes)) {
-        ::close(fd);
-        return WholeFileResult::Failed;
-    }
-    const QByteArray self = "/proc/self/fd/" + QByteArray::number(fd);
-    const bool linked =
-        ::linkat(AT_FDCWD, self.constData(), AT_FDCWD, target.constData(), AT_SYMLINK_FOLLOW) == 0;
-    const int error = errno;
-    ::close(fd);
-    // Without /proc the unnamed file cannot be named.
-    if (!linked && error == ENOENT && ::access("/proc/self/fd", F_OK) != 0)
-        return CreateThroughNamedFile(folder, target, bytes);
-    return LinkResult(linked, error);
+    return CreateWhole(path,
+                       [&bytes](int fd) { return WriteAll(fd, bytes.constData(), bytes.size()); });
 }
 
 } // namespace Platform

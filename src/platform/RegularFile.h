@@ -15,7 +15,8 @@ namespace Platform {
 bool OpenRegularFile(QFile& file, const QString& path);
 
 // Copies the regular file at source to a new file target; false when the source is not a
-// regular file, the target exists or the copy fails (a partial target is removed).
+// regular file, the target exists or the copy fails. The copy appears under target only when
+// complete, as CreateFileWhole makes its file.
 bool CopyRegularFile(const QString& source, const QString& target);
 
 // What CreateFileWhole did.

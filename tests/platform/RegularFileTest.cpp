@@ -5,10 +5,22 @@
 #include <QDir>
 #include <QFile>
 
+#include <sys/stat.h>
+
 namespace {
 
 using namespace Qt::StringLiterals;
 using Platform::WholeFileResult;
+
+// Whether the watched name existed when a write went past the file size limit.
+const char* g_watchedName = nullptr;
+volatile sig_atomic_t g_nameSeenDuringWrite = 0;
+
+void NameWatcher(int) {
+    struct stat status {};
+    if (::lstat(g_watchedName, &status) == 0)
+        g_nameSeenDuringWrite = 1;
+}
 
 class RegularFileTest : public AmbrelTest {
 protected:
@@ -53,6 +65,26 @@ TEST_F(RegularFileTest, CreateFileWholeThatCannotWriteLeavesNothingBehind) {
                   WholeFileResult::Failed);
     }
     EXPECT_EQ(FolderEntries(), QStringList());
+}
+
+// A copy cut off by a crash must not pass for the document later: the copy's name appears only
+// with the whole file. A write that fails past the file size limit stands in for the crash.
+TEST_F(RegularFileTest, ACopyAppearsUnderItsNameOnlyWhenWhole) {
+    const QString source = WriteFile(u"report.pdf"_s, QByteArray(64 * 1024, 'd'));
+    const QString copy = folder + u"/report.pdf"_s;
+    const QByteArray name = QFile::encodeName(copy);
+    g_watchedName = name.constData();
+    g_nameSeenDuringWrite = 0;
+    {
+        const FileSizeLimit limit(64 * 1024 - 1);
+        std::signal(SIGXFSZ, NameWatcher);
+        EXPECT_FALSE(Platform::CopyRegularFile(source, copy));
+    }
+    EXPECT_FALSE(g_nameSeenDuringWrite);
+    EXPECT_EQ(FolderEntries(), QStringList());
+    EXPECT_TRUE(Platform::CopyRegularFile(source, copy));
+    EXPECT_EQ(Read(copy), QByteArray(64 * 1024, 'd'));
+    EXPECT_FALSE(Platform::CopyRegularFile(source, copy));
 }
 
 } // namespace

@@ -334,60 +334,58 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
     CompanionBus bus;
     ASSERT_TRUE(bus.IsConnected());
     const int kills = Reliability::Rounds(8, 200);
-        int insideSave = 0;
-        int beforeStates = 0;
-        int afterStates = 0;
-        int serial = 0;
-        qint64 latencyMs = 60;
-        QSet<QByteArray> settingsSeen;
-        for (int round = 0; round <= kills; ++round) {
-            SCOPED_TRACE(u"round %1, seed %2"_s.arg(round).arg(seed).toStdString());
-            NavigatorProcess navigator(Home(), program);
-            navigator.Start();
-            ASSERT_TRUE(navigator.WaitUntilRunning(kWaitMs));
-            const QDeadlineTimer named(kWaitMs);
-            while (!bus.IsNavigatorRunning() && !named.hasExpired())
-                QThread::msleep(20);
-            ASSERT_TRUE(bus.IsNavigatorRunning());
+    int insideSave = 0;
+    int beforeStates = 0;
+    int afterStates = 0;
+    int serial = 0;
+    qint64 latencyMs = 60;
+    QSet<QByteArray> settingsSeen;
+    for (int round = 0; round <= kills; ++round) {
+        SCOPED_TRACE(u"round %1, seed %2"_s.arg(round).arg(seed).toStdString());
+        NavigatorProcess navigator(Home(), program);
+        navigator.Start();
+        ASSERT_TRUE(navigator.WaitUntilRunning(kWaitMs));
+        const QDeadlineTimer named(kWaitMs);
+        while (!bus.IsNavigatorRunning() && !named.hasExpired())
+            QThread::msleep(20);
+        ASSERT_TRUE(bus.IsNavigatorRunning());
 
-            // A few changes, each seen in the file: the started navigator has the whole catalog.
-            QByteArray bytes;
-            for (int change = 0; change < 3; ++change) {
-                const Change next = MakeChange(*state, ++serial);
-                QElapsedTimer took;
-                took.start();
-                ASSERT_TRUE(Send(bus, next));
-                bytes = AwaitChange(*state, next, took, &latencyMs);
-                ASSERT_FALSE(bytes.isEmpty())
-                    << "change " << next.kind << " never reached the file";
-                state = ReadCatalog(bytes);
-                settingsSeen.insert(ReadBytes(m_settingsPath));
-            }
-            if (round == kills) {
-                // The last start only shows that the notebook survived every kill.
-                ASSERT_TRUE(navigator.Terminate());
-                break;
-            }
+        // A few changes, each seen in the file: the started navigator has the whole catalog.
+        QByteArray bytes;
+        for (int change = 0; change < 3; ++change) {
+            const Change next = MakeChange(*state, ++serial);
+            QElapsedTimer took;
+            took.start();
+            ASSERT_TRUE(Send(bus, next));
+            bytes = AwaitChange(*state, next, took, &latencyMs);
+            ASSERT_FALSE(bytes.isEmpty()) << "change " << next.kind << " never reached the file";
+            state = ReadCatalog(bytes);
+            settingsSeen.insert(ReadBytes(m_settingsPath));
+        }
+        if (round == kills) {
+            // The last start only shows that the notebook survived every kill.
+            ASSERT_TRUE(navigator.Terminate());
+            break;
+        }
 
-            // One more change, and a kill somewhere between its arrival and its save's end.
-            const Change last = MakeChange(*state, ++serial);
-            bytes = ReadBytes(m_catalogPath);
-            const QByteArray settingsBefore = ReadBytes(m_settingsPath);
-            settingsSeen.insert(settingsBefore);
-            ASSERT_TRUE(Send(bus, last));
-            const int delayMs = std::uniform_int_distribution<int>(
-                0, static_cast<int>(std::max<qint64>(10, latencyMs * 3 / 2)))(m_random);
-            QThread::msleep(static_cast<unsigned long>(delayMs));
-            const qint64 pid = navigator.Process().processId();
-            ::kill(static_cast<pid_t>(pid), SIGSTOP);
-            insideSave += IsSavingCatalog(pid);
-            ::kill(static_cast<pid_t>(pid), SIGKILL);
-            ASSERT_TRUE(navigator.Process().waitForFinished(kWaitMs));
+        // One more change, and a kill somewhere between its arrival and its save's end.
+        const Change last = MakeChange(*state, ++serial);
+        bytes = ReadBytes(m_catalogPath);
+        const QByteArray settingsBefore = ReadBytes(m_settingsPath);
+        settingsSeen.insert(settingsBefore);
+        ASSERT_TRUE(Send(bus, last));
+        const int delayMs = std::uniform_int_distribution<int>(
+            0, static_cast<int>(std::max<qint64>(10, latencyMs * 3 / 2)))(m_random);
+        QThread::msleep(static_cast<unsigned long>(delayMs));
+        const qint64 pid = navigator.Process().processId();
+        ::kill(static_cast<pid_t>(pid), SIGSTOP);
+        insideSave += IsSavingCatalog(pid);
+        ::kill(static_cast<pid_t>(pid), SIGKILL);
+        ASSERT_TRUE(navigator.Process().waitForFinished(kWaitMs));
 
-            const QByteArray afterKill = ReadBytes(m_catalogPath);
-            const std::optional<Catalog> killed = ReadCatalog(afterKill);
-            ASSERT_TRUE(killed) << "the catalog does not parse after a kill " << delayMs
-                                << " ms in";
+        const QByteArray afterKill = ReadBytes(m_catalogPath);
+        const std::optional<Catalog> killed = ReadCatalog(afterKill);
+        ASSERT_TRUE(killed) << "the catalog does not parse after a kill " << delayMs << " ms in";
                     afterKill == bytes);
                     if (afterKill == bytes) {
                         ++beforeStates;
@@ -417,19 +415,19 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
                     }
                     EXPECT_EQ(CutOffFiles(), QStringList());
                     EXPECT_EQ(StrayFiles(), QStringList());
-        }
-        // The last start's catalog, written again on the way out, still holds every item.
-        const std::optional<Catalog> survived = ReadCatalog(ReadBytes(m_catalogPath));
-        ASSERT_TRUE(survived);
-        EXPECT_EQ(*survived, *state);
-        EXPECT_EQ(StrayFiles(), QStringList());
+    }
+    // The last start's catalog, written again on the way out, still holds every item.
+    const std::optional<Catalog> survived = ReadCatalog(ReadBytes(m_catalogPath));
+    ASSERT_TRUE(survived);
+    EXPECT_EQ(*survived, *state);
+    EXPECT_EQ(StrayFiles(), QStringList());
 
-        Reliability::Report(u"crash during save: %1 kills survived (catalog %2 items; %3 kills "
-                            "inside a catalog save; before-state %4, after-state %5)"_s.arg(kills)
-                                .arg(QLocale(QLocale::English).toString(kCatalogItems))
-                                .arg(insideSave)
-                                .arg(beforeStates)
-                                .arg(afterStates));
+    Reliability::Report(u"crash during save: %1 kills survived (catalog %2 items; %3 kills "
+                        "inside a catalog save; before-state %4, after-state %5)"_s.arg(kills)
+                            .arg(QLocale(QLocale::English).toString(kCatalogItems))
+                            .arg(insideSave)
+                            .arg(beforeStates)
+                            .arg(afterStates));
 }
 
 } // namespace
