@@ -386,35 +386,32 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
         const QByteArray afterKill = ReadBytes(m_catalogPath);
         const std::optional<Catalog> killed = ReadCatalog(afterKill);
         ASSERT_TRUE(killed) << "the catalog does not parse after a kill " << delayMs << " ms in";
-                    afterKill == bytes);
-                    if (afterKill == bytes) {
-                        ++beforeStates;
-                    } else {
-                        ASSERT_TRUE(IsChangedBy(*state, *killed, last, m_limit))
-                            << "after a kill " << delayMs << " ms into change " << last.kind
-                            << " the catalog is neither the one before nor the one after it";
-                        ++afterStates;
-                        state = killed;
-                    }
+        if (afterKill == bytes) {
+            ++beforeStates;
+        } else {
+            ASSERT_TRUE(IsChangedBy(*state, *killed, last, m_limit))
+                << "after a kill " << delayMs << " ms into change " << last.kind
+                << " the catalog is neither the one before nor the one after it";
+            ++afterStates;
+            state = killed;
+        }
 
-                    // The settings are one of the states written before, or that with the selection
-                    // of the last change.
-                    const QByteArray settingsBytes = ReadBytes(m_settingsPath);
-                    const std::map<QString, QString> settings = ReadSettings(settingsBytes);
-                    ASSERT_FALSE(settings.empty())
-                        << "the settings file does not parse after a kill";
-                    if (!settingsSeen.contains(settingsBytes)) {
-                        std::map<QString, QString> selectionless = settings;
-                        std::map<QString, QString> previous = ReadSettings(settingsBefore);
-                        selectionless.erase(u"lastselecteditemid"_s);
-                        previous.erase(u"lastselecteditemid"_s);
-                        EXPECT_EQ(selectionless, previous)
-                            << "the settings file is a state never written";
-                        EXPECT_TRUE(state->contains(settings.at(u"lastselecteditemid"_s)));
-                        settingsSeen.insert(settingsBytes);
-                    }
-                    EXPECT_EQ(CutOffFiles(), QStringList());
-                    EXPECT_EQ(StrayFiles(), QStringList());
+        // The settings are one of the states written before, or that with the selection
+        // of the last change.
+        const QByteArray settingsBytes = ReadBytes(m_settingsPath);
+        const std::map<QString, QString> settings = ReadSettings(settingsBytes);
+        ASSERT_FALSE(settings.empty()) << "the settings file does not parse after a kill";
+        if (!settingsSeen.contains(settingsBytes)) {
+            std::map<QString, QString> selectionless = settings;
+            std::map<QString, QString> previous = ReadSettings(settingsBefore);
+            selectionless.erase(u"lastselecteditemid"_s);
+            previous.erase(u"lastselecteditemid"_s);
+            EXPECT_EQ(selectionless, previous) << "the settings file is a state never written";
+            EXPECT_TRUE(state->contains(settings.at(u"lastselecteditemid"_s)));
+            settingsSeen.insert(settingsBytes);
+        }
+        EXPECT_EQ(CutOffFiles(), QStringList());
+        EXPECT_EQ(StrayFiles(), QStringList());
     }
     // The last start's catalog, written again on the way out, still holds every item.
     const std::optional<Catalog> survived = ReadCatalog(ReadBytes(m_catalogPath));
