@@ -5,7 +5,6 @@
 #include "CatalogGenerator.h"
 #include "companion/CompanionBus.h"
 
-#include <QDateTime>
 #include <QDeadlineTimer>
 #include <QDir>
 #include <QElapsedTimer>
@@ -23,6 +22,7 @@
 #include <optional>
 #include <random>
 
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace {
@@ -76,6 +76,24 @@ std::optional<Catalog> ReadCatalog(const QByteArray& bytes) {
     if (catalog.empty())
         return std::nullopt;
     return catalog;
+}
+
+// Tells one version of a file from the next: each save replaces the file with a new one.
+struct FileStamp {
+    ino_t inode = 0;
+    timespec modified{};
+    off_t size = -1;
+    bool operator==(const FileStamp& other) const {
+        return inode == other.inode && modified.tv_sec == other.modified.tv_sec &&
+               modified.tv_nsec == other.modified.tv_nsec && size == other.size;
+    }
+};
+
+FileStamp Stamp(const QString& path) {
+    struct stat status {};
+    if (::stat(QFile::encodeName(path).constData(), &status) != 0)
+        return {};
+    return {status.st_ino, status.st_mtim, status.st_size};
 }
 
 QByteArray ReadBytes(const QString& path) {
@@ -175,21 +193,19 @@ protected:
         m_settingsPath = AppDataFolder() + u"/NavSettings.dat"_s;
     }
 
-    // Waits until the catalog file is `before` changed by `change`; answers its bytes, and in
-    // tookMs how long after `since` the file was replaced with them.
-    QByteArray AwaitChange(const Catalog& before, const Change& change, const QElapsedTimer& since,
-                           qint64* tookMs) {
+    // Waits until the catalog file, replaced after `sent`, is `before` changed by `change`;
+    // answers its bytes, and in tookMs how long after `since` the file was replaced with them.
+    QByteArray AwaitChange(const Catalog& before, const Change& change, FileStamp sent,
+                           const QElapsedTimer& since, qint64* tookMs) {
         const QDeadlineTimer deadline(kWaitMs);
-        QFileInfo seen(m_catalogPath);
-        QDateTime seenTime = seen.lastModified();
         while (!deadline.hasExpired()) {
-            QFileInfo now(m_catalogPath);
-            if (now.lastModified() == seenTime) {
+            const FileStamp now = Stamp(m_catalogPath);
+            if (now == sent) {
                 QThread::msleep(2);
                 continue;
             }
             *tookMs = since.elapsed();
-            seenTime = now.lastModified();
+            sent = now;
             const QByteArray bytes = ReadBytes(m_catalogPath);
             const std::optional<Catalog> catalog = ReadCatalog(bytes);
             if (catalog && IsChangedBy(before, *catalog, change, m_limit))
@@ -281,7 +297,7 @@ protected:
 
     // A linked document's file: large enough that copying it into the notebook takes a while.
     static QByteArray DocumentBytes() {
-        static const QByteArray bytes = "%PDF-1.4\n" + QByteArray(4 << 20, 'd') + "%%EOF\n";
+        static const QByteArray bytes = "%PDF-1.4\n" + QByteArray(1 << 20, 'd') + "%%EOF\n";
         return bytes;
     }
 
@@ -354,10 +370,11 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
         QByteArray bytes;
         for (int change = 0; change < 3; ++change) {
             const Change next = MakeChange(*state, ++serial);
+            const FileStamp sent = Stamp(m_catalogPath);
             QElapsedTimer took;
             took.start();
             ASSERT_TRUE(Send(bus, next));
-            bytes = AwaitChange(*state, next, took, &latencyMs);
+            bytes = AwaitChange(*state, next, sent, took, &latencyMs);
             ASSERT_FALSE(bytes.isEmpty()) << "change " << next.kind << " never reached the file";
             state = ReadCatalog(bytes);
             settingsSeen.insert(ReadBytes(m_settingsPath));
