@@ -16,7 +16,7 @@ namespace Platform {
 
 namespace {
 
-// Writes out what fill writes to fd, and makes it durable.
+// Writes a new file's content to its descriptor; false when a write fails.
 using Filler = std::function<bool(int fd)>;
 
 bool WriteAll(int fd, const char* at, qsizetype left) {
@@ -64,6 +64,9 @@ WholeFileResult CreateWhole(const QString& path, const Filler& fill) {
     const QFileInfo info(path);
     const QByteArray folder = QFile::encodeName(info.absolutePath());
     const QByteArray target = QFile::encodeName(info.absoluteFilePath());
+    // Without /proc an unnamed file cannot be given a name.
+    if (::access("/proc/self/fd", F_OK) != 0)
+        return CreateThroughNamedFile(folder, target, fill);
     const int fd = ::open(folder.constData(), O_TMPFILE | O_WRONLY | O_CLOEXEC, 0666);
     if (fd < 0) {
         if (errno != EOPNOTSUPP && errno != EISDIR && errno != EINVAL)
@@ -79,9 +82,6 @@ WholeFileResult CreateWhole(const QString& path, const Filler& fill) {
         ::linkat(AT_FDCWD, self.constData(), AT_FDCWD, target.constData(), AT_SYMLINK_FOLLOW) == 0;
     const int error = errno;
     ::close(fd);
-    // Without /proc the unnamed file cannot be named.
-    if (!linked && error == ENOENT && ::access("/proc/self/fd", F_OK) != 0)
-        return CreateThroughNamedFile(folder, target, fill);
     return LinkResult(linked, error);
 }
 

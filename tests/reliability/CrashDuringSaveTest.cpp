@@ -163,6 +163,29 @@ bool IsChangedBy(const Catalog& before, const Catalog& after, const Change& chan
     return seen == expected;
 }
 
+// What differs between two catalogs, for a failure's message.
+std::string Differences(const Catalog& before, const Catalog& after) {
+    QStringList lines;
+    const auto describe = [](const Item& item) {
+        return u"%1 under %2 \"%3\"%4%5"_s.arg(item.kind, item.parent, item.title,
+                                               item.linked ? u" linked"_s : QString(),
+                                               item.deleted ? u" deleted"_s : QString());
+    };
+    for (const auto& [id, item] : before) {
+        const auto there = after.find(id);
+        if (there == after.end())
+            lines << u"gone: "_s + id + u' ' + describe(item);
+        else if (!(there->second == item))
+            lines << u"changed: "_s + id + u' ' + describe(item) + u" -> "_s +
+                         describe(there->second);
+    }
+    for (const auto& [id, item] : after) {
+        if (!before.contains(id))
+            lines << u"new: "_s + id + u' ' + describe(item);
+    }
+    return lines.mid(0, 10).join(u'\n').toStdString();
+}
+
 // The settings file as its keys and values; empty when it is not the eighteen keys.
 std::map<QString, QString> ReadSettings(const QByteArray& bytes) {
     const QString text =
@@ -375,7 +398,13 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
             took.start();
             ASSERT_TRUE(Send(bus, next));
             bytes = AwaitChange(*state, next, sent, took, &latencyMs);
-            ASSERT_FALSE(bytes.isEmpty()) << "change " << next.kind << " never reached the file";
+            const std::optional<Catalog> seen = ReadCatalog(ReadBytes(m_catalogPath));
+            ASSERT_FALSE(bytes.isEmpty())
+                << "change " << next.kind << " of " << next.itemId.toStdString() << " "
+                << next.value.toStdString() << " never reached the file; navigator "
+                << (navigator.Process().state() == QProcess::Running ? "running" : "gone")
+                << "; the file differs by:\n"
+                << (seen ? Differences(*state, *seen) : std::string("(no catalog)"));
             state = ReadCatalog(bytes);
             settingsSeen.insert(ReadBytes(m_settingsPath));
         }
