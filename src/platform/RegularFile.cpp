@@ -1,8 +1,10 @@
 #include "platform/RegularFile.h"
 
 #include <QByteArray>
+#include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QRegularExpression>
 
 #include <cerrno>
 #include <cstdlib>
@@ -121,6 +123,17 @@ bool CopyRegularFile(const QString& source, const QString& target) {
 WholeFileResult CreateFileWhole(const QString& path, const QByteArray& bytes) {
     return CreateWhole(path,
                        [&bytes](int fd) { return WriteAll(fd, bytes.constData(), bytes.size()); });
+}
+
+void RemoveLeftSaveFiles(const QString& path) {
+    const QFileInfo info(path);
+    const QRegularExpression left(QRegularExpression::anchoredPattern(
+        QRegularExpression::escape(info.fileName()) + QStringLiteral("\\.[A-Za-z0-9]{6}")));
+    const QDir folder = info.absoluteDir();
+    for (const QString& name : folder.entryList(QDir::Files | QDir::Hidden | QDir::NoSymLinks)) {
+        if (left.match(name).hasMatch())
+            QFile::remove(folder.filePath(name));
+    }
 }
 
 } // namespace Platform

@@ -27,4 +27,9 @@ enum class WholeFileResult { Created, NameTaken, Failed };
 // existing entry of that name (a dangling link too) is never written over nor followed.
 WholeFileResult CreateFileWhole(const QString& path, const QByteArray& bytes);
 
+// Removes what a save of the file at path left when the program was killed between writing
+// the new file under a temporary name ("<name>.XXXXXX" beside it) and renaming it over the
+// old one. Only for a file that one process alone saves, before it saves again.
+void RemoveLeftSaveFiles(const QString& path);
+
 } // namespace Platform

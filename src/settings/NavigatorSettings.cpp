@@ -9,6 +9,7 @@
 #include "messaging/CNoteToolService.h"
 #include "messaging/CViewerService.h"
 #include "platform/AppFolders.h"
+#include "platform/RegularFile.h"
 #include "platform/ScreenMetrics.h"
 #include "settings/ISettingsWindow.h"
 #include "settings/StorageRegistry.h"
@@ -145,6 +146,8 @@ bool NavigatorSettings::Load() {
     const QString path = SettingsFilePath();
     if (path.isEmpty())
         return false;
+    // What a save cut short by a kill left beside the file; only this navigator saves it.
+    Platform::RemoveLeftSaveFiles(path);
     QFile file(path);
     if (!file.open(QIODevice::ReadOnly))
         return false;
