@@ -4,6 +4,7 @@
 #include "dataexchange/CRecursiveChildrenReporter.h"
 #include "libs/toolwell/IDataStoreHost.h"
 #include "libs/toolwell/ItemIdentifier.h"
+#include "platform/RegularFile.h"
 
 #include <QDir>
 #include <QFileInfo>
@@ -165,6 +166,9 @@ bool XmlDataStore::Initialize() {
     exists = false;
     if (m_host->GetCatalogPath(&catalog, &exists) == 0)
         return false;
+    // A navigator killed in the middle of its last save may have left the new catalog under a
+    // temporary name; the start-up lock makes this the only navigator that could be saving.
+    Platform::RemoveLeftSaveFiles(catalog);
     return exists || CreateEmptyArchive(catalog);
 }
 

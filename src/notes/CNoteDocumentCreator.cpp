@@ -4,9 +4,7 @@
 #include "common/ReleasePtr.h"
 #include "notes/FormatLength.h"
 #include "notes/IHTMLContentTextConverter.h"
-
-#include <QFile>
-#include <QFileInfo>
+#include "platform/RegularFile.h"
 
 #include <new>
 
@@ -115,22 +113,16 @@ QByteArray CNoteDocumentCreator::FileBytes() {
 }
 
 HRESULT CNoteDocumentCreator::Write() {
-    const QByteArray bytes = FileBytes();
-
-    // A note file is never written over: an existing file stays as it is.
-    QFile file(m_filePath);
-    if (!file.open(QIODevice::WriteOnly | QIODevice::NewOnly)) {
-        const QFileInfo there(m_filePath);
-        return there.exists() || there.isSymLink() ? S_OK : E_FAIL;
+    // A note file is never written over: an existing file stays as it is. A crash while
+    // writing leaves no note rather than a cut-off one.
+    switch (Platform::CreateFileWhole(m_filePath, FileBytes())) {
+    case Platform::WholeFileResult::Created:
+    case Platform::WholeFileResult::NameTaken:
+        return S_OK;
+    case Platform::WholeFileResult::Failed:
+        break;
     }
-    if (file.write(bytes) != bytes.size() || !file.flush()) {
-        // A cut-off note is worse than none: the caller removes the item again.
-        file.close();
-        file.remove();
-        return E_FAIL;
-    }
-    file.close();
-    return S_OK;
+    return E_FAIL;
 }
 
 unsigned long CNoteDocumentCreator::Release() {

@@ -10,6 +10,7 @@
 #include "messaging/CViewerService.h"
 #include "platform/AppFolders.h"
 #include "platform/FileWrite.h"
+#include "platform/RegularFile.h"
 #include "platform/ScreenMetrics.h"
 #include "settings/ISettingsWindow.h"
 #include "settings/StorageRegistry.h"
@@ -146,6 +147,8 @@ bool NavigatorSettings::Load() {
     const QString path = SettingsFilePath();
     if (path.isEmpty())
         return false;
+    // What a save cut short by a kill left beside the file; only this navigator saves it.
+    Platform::RemoveLeftSaveFiles(path);
     QFile file(path);
     if (!file.open(QIODevice::ReadOnly))
         return false;

@@ -10,6 +10,7 @@
 #include "support/FileWatch.h"
 
 #include <QDir>
+#include <QFile>
 #include <QFileInfo>
 #include <QRegularExpression>
 
@@ -80,6 +81,25 @@ protected:
     ReleasePtr<IDataStoreHost> m_host;
     QString m_catalog;
 };
+
+// A navigator killed between writing its new catalog under a temporary name and renaming it
+// leaves that file behind; the next start removes it, and nothing else.
+TEST_F(DataStoreServiceTest, OpeningRemovesTheNewCatalogThatAKilledSaveLeft) {
+    const QString folder = QFileInfo(m_catalog).absolutePath();
+    ASSERT_TRUE(QDir().mkpath(folder));
+    const QStringList left{QStringLiteral("catalog.xml.Tx4yFV")};
+    const QStringList kept{QStringLiteral("catalog.xml.bak"), QStringLiteral("other.xml.Tx4yFV"),
+                           QStringLiteral("catalog.xml.Tx4yFV2")};
+    for (const QString& name : left + kept) {
+        QFile file(folder + u'/' + name);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly));
+    }
+    ASSERT_NE(Service(), nullptr);
+    for (const QString& name : left)
+        EXPECT_FALSE(QFile::exists(folder + u'/' + name)) << name.toStdString();
+    for (const QString& name : kept)
+        EXPECT_TRUE(QFile::exists(folder + u'/' + name)) << name.toStdString();
+}
 
 TEST_F(DataStoreServiceTest, ServiceIsCreatedOnceAndShutdownSaves) {
     EXPECT_EQ(CreateDataStoreService(nullptr), nullptr);

@@ -1,10 +1,24 @@
 #include "common/ReleasePtr.h"
 #include "notes/INoteDocumentCreator.h"
 #include "support/AmbrelTest.h"
+#include "support/FileSizeLimit.h"
 
+#include <QDir>
 #include <QFile>
 
+#include <sys/stat.h>
+
 namespace {
+
+// Whether the note's name existed when a write went past the file size limit.
+const char* g_watchedName = nullptr;
+volatile sig_atomic_t g_nameSeenDuringWrite = 0;
+
+void NoteNameWatcher(int) {
+    struct stat status {};
+    if (::lstat(g_watchedName, &status) == 0)
+        g_nameSeenDuringWrite = 1;
+}
 
 class NoteDocumentCreatorTest : public AmbrelTest {
 protected:
@@ -103,6 +117,22 @@ TEST_F(NoteDocumentCreatorTest, WriteNeverReplacesAFileNorFollowsALink) {
 
     creator->SetFilePath(Home() + QStringLiteral("/missing/note.htm"));
     EXPECT_EQ(creator->Write(), E_FAIL);
+}
+
+// A crash in the middle of writing must not leave a cut-off note: the name appears only with
+// the whole file. A write that fails past the file size limit stands in for the crash.
+TEST_F(NoteDocumentCreatorTest, ANoteFileAppearsUnderItsNameOnlyWhenWhole) {
+    creator->SetContent(QString(64 * 1024, u'x'));
+    const QByteArray name = QFile::encodeName(path);
+    g_watchedName = name.constData();
+    g_nameSeenDuringWrite = 0;
+    {
+        const FileSizeLimit limit(4096);
+        std::signal(SIGXFSZ, NoteNameWatcher);
+        EXPECT_EQ(creator->Write(), E_FAIL);
+    }
+    EXPECT_FALSE(g_nameSeenDuringWrite);
+    EXPECT_EQ(QDir(Home()).entryList(QDir::Files | QDir::Hidden | QDir::System), QStringList());
 }
 
 } // namespace
