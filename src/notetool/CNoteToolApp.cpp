@@ -5,6 +5,7 @@
 #include "libs/toolwell/Formats.h"
 #include "notetool/CNoteEditor.h"
 #include "notetool/CNoteWindow.h"
+#include "platform/RegularFile.h"
 
 #include "ui/ShowCommand.h"
 
@@ -83,6 +84,9 @@ bool CNoteToolApp::Start() {
     // A note without a file yet takes the look the navigator gave it.
     ApplyProperties(m_startProperties, false);
     const QString catalogTitle = m_content.title;
+    // A note tool killed between writing the note under a temporary name and renaming it left
+    // that file beside the note; the note's bus name makes this the only tool saving it.
+    Platform::RemoveLeftSaveFiles(m_file.Path());
     m_fileState = m_file.Load(&m_content);
     if (!catalogTitle.isEmpty())
         m_content.title = catalogTitle;

@@ -72,7 +72,11 @@ protected:
 
 TEST_F(NoteFileTest, ANavigatorNoteIsEditedAndSavedWithItsOwnHeader) {
     WriteNavigatorNote(u"<P>milk</P>"_s);
+    // What a save killed before its rename left beside the note goes when the note opens.
+    const QString left = NotePath() + u".Tx4yFV"_s;
+    WriteFile(left.mid(Home().size() + 1), "half a note");
     std::unique_ptr<CNoteToolApp> note = StartNote();
+    EXPECT_FALSE(QFile::exists(left));
     CNoteWindow* window = note->Window();
     EXPECT_EQ(window->NoteTitle(), u"Shopping list & more"_s);
     EXPECT_EQ(window->size(), QSize(600, 300));
