@@ -83,31 +83,34 @@ QString Between(const QString& text, QLatin1StringView open, QLatin1StringView c
     return text.mid(begin, end - begin);
 }
 
-// The declarations of one rule of the style sheet, "NAME : value;" each.
+// The declarations of one rule of the style sheet, "NAME : value;" each. Rules are looked for
+// only between blocks: a value, a picture's path above all, may hold text that reads like one.
 QList<std::pair<QString, QString>> Declarations(const QString& styleSheet, QLatin1StringView rule) {
     QList<std::pair<QString, QString>> result;
     qsizetype at = 0;
-    for (;;) {
-        at = styleSheet.indexOf(rule, at, Qt::CaseInsensitive);
-        if (at < 0)
+    while (at < styleSheet.size()) {
+        const qsizetype open = styleSheet.indexOf(u'{', at);
+        if (open < 0)
             return result;
-        const bool starts = at == 0 || !styleSheet[at - 1].isLetterOrNumber();
-        const qsizetype brace = styleSheet.indexOf(u'{', at + rule.size());
-        if (starts && brace >= 0 &&
-            QStringView(styleSheet)
-                .mid(at + rule.size(), brace - at - rule.size())
-                .trimmed()
-                .isEmpty())
-            break;
-        at += rule.size();
-    }
-    const QString block = Between(styleSheet, rule, "}"_L1, at);
-    const QString inside = block.mid(block.indexOf(u'{') + 1);
-    for (const QString& declaration : inside.split(u';', Qt::SkipEmptyParts)) {
-        const qsizetype colon = declaration.indexOf(u':');
-        if (colon > 0)
-            result.append({declaration.left(colon).trimmed().toUpper(),
-                           declaration.mid(colon + 1).trimmed()});
+        qsizetype close = styleSheet.indexOf(u'}', open + 1);
+        if (close < 0)
+            close = styleSheet.size();
+        // The selector's last word: "<!-- BODY" is the rule BODY.
+        const QStringView before = QStringView(styleSheet).mid(at, open - at).trimmed();
+        qsizetype word = before.size();
+        while (word > 0 && (before[word - 1].isLetterOrNumber() || before[word - 1] == u'-'))
+            --word;
+        if (before.mid(word).compare(rule, Qt::CaseInsensitive) == 0) {
+            const QString inside = styleSheet.mid(open + 1, close - open - 1);
+            for (const QString& declaration : inside.split(u';', Qt::SkipEmptyParts)) {
+                const qsizetype colon = declaration.indexOf(u':');
+                if (colon > 0)
+                    result.append({declaration.left(colon).trimmed().toUpper(),
+                                   declaration.mid(colon + 1).trimmed()});
+            }
+            return result;
+        }
+        at = close + 1;
     }
     return result;
 }

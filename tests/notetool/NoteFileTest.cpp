@@ -150,13 +150,18 @@ TEST_F(NoteFileTest, OddHeadersReadAsTheyAreMeantAndSaveTheSameEveryTime) {
         QString fontFamily;
         std::uint32_t backgroundColor;
         QString backgroundImage;
+        std::uint32_t margin;
     };
     const Row rows[] = {
         // An empty font name names no font: the note keeps the font it has.
-        {"BODY { FONT-FAMILY : ;FONT-SIZE : 9 pt; }", u"Times New Roman"_s, 0x00FFFFFF, u"none"_s},
-        // A colour written in the picture's path is part of the path, not the note's colour.
+        {"BODY { FONT-FAMILY : ;FONT-SIZE : 9 pt; }", u"Times New Roman"_s, 0x00FFFFFF, u"none"_s,
+         0},
+        // A picture's path is only a path, whatever it holds: a colour or a rule.
         {"BODY { BACKGROUND : #102030 url( /p/paper #e0e0ff.png ) repeat; }", u"Times New Roman"_s,
-         0x00302010, u"/p/paper #e0e0ff.png"_s},
+         0x00302010, u"/p/paper #e0e0ff.png"_s, 0},
+        {"<!-- BODY { BACKGROUND : #102030 url( /p/P { MARGIN-TOP : 2 em ) repeat; } "
+         "P { MARGIN-TOP : 3 em; } -->",
+         u"Times New Roman"_s, 0x00302010, u"/p/P { MARGIN-TOP : 2 em"_s, 3},
     };
     for (const Row& row : rows) {
         NoteContent read;
@@ -166,6 +171,7 @@ TEST_F(NoteFileTest, OddHeadersReadAsTheyAreMeantAndSaveTheSameEveryTime) {
         EXPECT_EQ(read.fontFamily, row.fontFamily) << row.style.constData();
         EXPECT_EQ(read.backgroundColor, row.backgroundColor) << row.style.constData();
         EXPECT_EQ(read.backgroundImage, row.backgroundImage) << row.style.constData();
+        EXPECT_EQ(read.margin, row.margin) << row.style.constData();
         const QByteArray saved = CNoteFile::Format(read);
         NoteContent reread;
         ASSERT_TRUE(CNoteFile::Parse(saved, &reread));
