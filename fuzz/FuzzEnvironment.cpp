@@ -1,20 +1,7 @@
 #include "FuzzEnvironment.h"
 
-#include "catalog/IDataStoreService.h"
-#include "libs/lustre/CVisualStyleManager.h"
-#include "libs/sheen/ThemeUtilities.h"
-#include "libs/toolwell/CHarborUtils.h"
-#include "libs/toolwell/IItemWindowHub.h"
-#include "libs/toolwell/ISnapshotService.h"
-#include "messaging/CNoteToolService.h"
-#include "messaging/CViewerService.h"
-#include "navigator/WNavDS.h"
-#include "platform/IForeignWindows.h"
-#include "platform/IMessageBox.h"
-#include "platform/IProcessLauncher.h"
-#include "platform/IWaitCursor.h"
 #include "platform/Registry.h"
-#include "settings/NavigatorSettings.h"
+#include "support/ResetSingletons.h"
 
 #include <QApplication>
 #include <QCoreApplication>
@@ -33,6 +20,10 @@ namespace {
 QString g_home;
 // Made once and kept to the end of the process, as in the program.
 QCoreApplication* g_application = nullptr;
+
+QString MachineFile() {
+    return g_home + QStringLiteral("/etc/Quillmark Ambrel.ini");
+}
 
 } // namespace
 
@@ -60,7 +51,7 @@ void SetUp(int* argc, char*** argv, Application application) {
         g_application = new QApplication(*argc, *argv);
     else
         g_application = new QCoreApplication(*argc, *argv);
-    Platform::Registry::SetMachineFile(g_home + QStringLiteral("/etc/Quillmark Ambrel.ini"));
+    Platform::Registry::SetMachineFile(MachineFile());
 }
 
 QString Home() {
@@ -76,21 +67,8 @@ void RemoveAppData() {
 }
 
 void ResetProgram() {
-    ReleaseHarborUtilsInterface();
-    Platform::SetMessageBox(nullptr);
-    Platform::SetWaitCursor(nullptr);
-    Platform::SetProcessLauncher(nullptr);
-    SetSnapshotNoteHandler({});
-    WNavDS::DestroyInstance();
-    if (IDataStoreService* service = GetDataStoreService())
-        service->Shutdown(0);
-    NavigatorSettings::DestroyInstance();
-    CNoteToolService::ResetInstance();
-    CViewerService::ResetInstance();
-    SetItemWindowHub(nullptr);
-    Platform::SetForeignWindows(nullptr);
-    ShutdownThemeUtilities();
-    DeleteVisualStyleManager();
+    ResetSingletons();
+    Platform::Registry::SetMachineFile(MachineFile());
 }
 
 QByteArray ReadFile(const QString& path) {

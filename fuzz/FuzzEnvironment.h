@@ -18,7 +18,8 @@ QString Home();
 QString AppDataFolder();
 // Removes the program's data folder and everything in it.
 void RemoveAppData();
-// Puts every process-wide singleton of the program back to its first state.
+// Puts every process-wide singleton of the program back to its first state, the machine's
+// registry file still in the temporary home.
 void ResetProgram();
 
 QByteArray ReadFile(const QString& path);

@@ -1,4 +1,4 @@
-#include "ReliabilityReport.h"
+#include "Reliability.h"
 #include "support/AmbrelTest.h"
 #include "support/NavigatorProcess.h"
 
@@ -282,23 +282,6 @@ protected:
         return false;
     }
 
-    // Whether the stopped navigator holds a file of the catalog folder open other than the
-    // catalog itself: the new catalog being written.
-    bool IsSavingCatalog(qint64 pid) const {
-        const QString fds = u"/proc/%1/fd"_s.arg(pid);
-        for (const QString& fd :
-             QDir(fds).entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot)) {
-            char buffer[4096];
-            const ssize_t length =
-                ::readlink(QFile::encodeName(fds + u'/' + fd).constData(), buffer, sizeof buffer);
-            const QString target =
-                QFile::decodeName(QByteArray(buffer, std::max<ssize_t>(length, 0)));
-            if (target.startsWith(m_catalogFolder + u'/') && target != m_catalogPath)
-                return true;
-        }
-        return false;
-    }
-
     // Entries beside the catalog and the settings that no navigator made on purpose.
     QStringList StrayFiles() const {
         QStringList stray;
@@ -425,7 +408,7 @@ TEST_F(CrashDuringSaveTest, AKillAtAnyMomentLeavesTheCatalogBeforeOrAfterTheLast
         QThread::msleep(static_cast<unsigned long>(delayMs));
         const qint64 pid = navigator.Process().processId();
         ::kill(static_cast<pid_t>(pid), SIGSTOP);
-        insideSave += IsSavingCatalog(pid);
+        insideSave += Reliability::HoldsOpenFileIn(pid, m_catalogFolder, m_catalogPath);
         ::kill(static_cast<pid_t>(pid), SIGKILL);
         ASSERT_TRUE(navigator.Process().waitForFinished(kWaitMs));
 

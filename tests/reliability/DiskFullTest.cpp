@@ -1,6 +1,6 @@
 // Full disks and read-only folders: every save fails cleanly, the old files stay whole, no
 // temporary file is left behind, nothing crashes and the user hears once for each kind of file.
-#include "ReliabilityReport.h"
+#include "Reliability.h"
 
 #include "app/CNavigatorApp.h"
 #include "catalog/IDataStoreService.h"
@@ -142,16 +142,6 @@ bool NavigatorAnswers() {
         kNavigatorName, u"/AmbrelService"_s, u"com.brindle.QuillmarkAmbrel.Broker"_s, u"Post"_s);
     post.setArguments({u"DiskFullTest"_s, QVariant::fromValue(QMap<QString, QString>())});
     return QDBusConnection::sessionBus().call(post).type() == QDBusMessage::ReplyMessage;
-}
-
-QString NoteToolOnBus() {
-    const QStringList names =
-        QDBusConnection::sessionBus().interface()->registeredServiceNames().value();
-    for (const QString& name : names) {
-        if (name.startsWith(u"com.brindle.QuillmarkAmbrel.NoteTool."_s))
-            return name;
-    }
-    return {};
 }
 
 class DiskFullTest : public AmbrelTest {
@@ -346,7 +336,7 @@ void DiskFullTest::NoteToolSaves(Jail jail, Figures* figures) {
     StartJailed(process, jail, folder, noteTool,
                 {notePath, u"/PROPERTY"_s, u"itemid|"_s + kNoteId + u'|'});
     QString name;
-    ASSERT_TRUE(WaitFor([&] { return !(name = NoteToolOnBus()).isEmpty(); }));
+    ASSERT_TRUE(WaitFor([&] { return !(name = Reliability::NoteToolOnBus()).isEmpty(); }));
     for (int save = 0; save < Reliability::Rounds(3, 30); ++save) {
         QDBusMessage rename = QDBusMessage::createMethodCall(
             name, u"/NoteTool"_s, u"com.brindle.QuillmarkAmbrel.NoteTool"_s, u"SetTitle"_s);
@@ -368,7 +358,7 @@ void DiskFullTest::NoteToolSaves(Jail jail, Figures* figures) {
     const QMap<QString, QByteArray> after = FilesBelow(folder);
     EXPECT_EQ(after, before) << "the note changed, or a temporary file was left";
     figures->temporaryFiles += LeftBehind(before, after);
-    ASSERT_TRUE(WaitFor([] { return NoteToolOnBus().isEmpty(); }));
+    ASSERT_TRUE(WaitFor([] { return Reliability::NoteToolOnBus().isEmpty(); }));
 }
 
 // One test, so that the figures of all the checks go into one line.

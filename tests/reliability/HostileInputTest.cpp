@@ -1,4 +1,4 @@
-#include "ReliabilityReport.h"
+#include "Reliability.h"
 #include "companion/CompanionBus.h"
 #include "navigator/NavigatorModelFixture.h"
 #include "support/NavigatorProcess.h"

@@ -1,9 +1,8 @@
-#include "ReliabilityReport.h"
+#include "Reliability.h"
 #include "support/AmbrelTest.h"
 #include "support/NavigatorProcess.h"
 
 #include <QDBusConnection>
-#include <QDBusConnectionInterface>
 #include <QDBusMessage>
 #include <QDBusPendingCall>
 #include <QDBusReply>
@@ -33,17 +32,6 @@ QByteArray ReadBytes(const QString& path) {
 
 class NoteToolCrashTest : public AmbrelTest {
 protected:
-    // The note tool that has a note open, by its bus name; empty when none has.
-    static QString NoteToolName() {
-        const QStringList names =
-            QDBusConnection::sessionBus().interface()->registeredServiceNames().value();
-        for (const QString& name : names) {
-            if (name.startsWith(u"com.brindle.QuillmarkAmbrel.NoteTool."_s))
-                return name;
-        }
-        return {};
-    }
-
     static QDBusMessage Call(const QString& name, const QString& method,
                              const QVariantList& arguments = {}) {
         QDBusMessage call = QDBusMessage::createMethodCall(
@@ -57,28 +45,10 @@ protected:
         noteTool.Start({note});
         const QDeadlineTimer deadline(kWaitMs);
         QString name;
-        while ((name = NoteToolName()).isEmpty() && !deadline.hasExpired() &&
+        while ((name = Reliability::NoteToolOnBus()).isEmpty() && !deadline.hasExpired() &&
                noteTool.Process().state() != QProcess::NotRunning)
             QThread::msleep(20);
         return name;
-    }
-
-    // Whether the stopped note tool holds a file of the note's folder open other than the note
-    // itself: the new note being written.
-    static bool IsSavingNote(qint64 pid, const QString& note) {
-        const QString folder = QFileInfo(note).absolutePath();
-        const QString fds = u"/proc/%1/fd"_s.arg(pid);
-        for (const QString& fd :
-             QDir(fds).entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot)) {
-            char buffer[4096];
-            const ssize_t length =
-                ::readlink(QFile::encodeName(fds + u'/' + fd).constData(), buffer, sizeof buffer);
-            const QString target =
-                QFile::decodeName(QByteArray(buffer, std::max<ssize_t>(length, 0)));
-            if (target.startsWith(folder + u'/') && target != note)
-                return true;
-        }
-        return false;
     }
 };
 
@@ -135,7 +105,7 @@ TEST_F(NoteToolCrashTest, AKillWhileSavingLeavesTheOldNoteOrTheNewOne) {
         QThread::msleep(static_cast<unsigned long>(delayMs));
         const qint64 pid = noteTool.Process().processId();
         ::kill(static_cast<pid_t>(pid), SIGSTOP);
-        insideSave += IsSavingNote(pid, note);
+        insideSave += Reliability::HoldsOpenFileIn(pid, QFileInfo(note).absolutePath(), note);
         ::kill(static_cast<pid_t>(pid), SIGKILL);
         ASSERT_TRUE(noteTool.Process().waitForFinished(kWaitMs));
 

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "support/ResetSingletons.h"
+
 #include <gtest/gtest.h>
 
 #include <QString>
@@ -36,6 +38,3 @@ protected:
 private:
     std::unique_ptr<QTemporaryDir> m_home;
 };
-
-// Puts every process-wide singleton of the program back to its first state.
-void ResetSingletons();

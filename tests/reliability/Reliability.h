@@ -17,4 +17,10 @@ void Report(const QString& line);
 // companion programs beside it and starts none of them; answers its path.
 QString LoneNavigatorCopy(const QString& home);
 
+// Whether the process holds a file of the folder open other than `except`: a stopped program
+// caught writing its new file.
+bool HoldsOpenFileIn(qint64 pid, const QString& folder, const QString& except);
+// The bus name of the note tool that has a note open; empty when none has.
+QString NoteToolOnBus();
+
 } // namespace Reliability
