@@ -21,6 +21,7 @@
 #include <QSaveFile>
 #include <QtEndian>
 
+#include <algorithm>
 #include <climits>
 
 namespace {
@@ -78,6 +79,11 @@ void ApplyPosition(const QString& text, WindowRect* position) {
     // The program always writes four numbers; a rectangle is not built from missing ones.
     if (count < 4)
         return;
+    // Numbers beyond any screen are held where the edges can still be computed; they are off
+    // the screen all the same.
+    constexpr int kFar = 1 << 24;
+    for (int& number : numbers)
+        number = std::clamp(number, -kFar, kFar);
     WindowRect rect =
         WindowRect::FromGeometry(QRect(numbers.at(0), numbers.at(1), numbers.at(2), numbers.at(3)));
     const QRect screen = Platform::VirtualScreenRect();

@@ -103,6 +103,9 @@ TEST_F(SettingsFileTest, PositionIsPutBackOnTheVirtualScreen) {
     EXPECT_EQ(PositionAfterLoading(u"90000,40,300,200"), (WindowRect{0, 40, 280, 240}));
     EXPECT_EQ(PositionAfterLoading(u"60,90000,300,200"), (WindowRect{60, 0, 360, 650}));
     EXPECT_EQ(PositionAfterLoading(u"-100,-20,300,200"), (WindowRect{-100, -20, 200, 180}));
+    // Edges beyond the range of numbers are off the screen too.
+    EXPECT_EQ(PositionAfterLoading(u"2147483647,40,400,300"), (WindowRect{0, 40, 280, 340}));
+    EXPECT_EQ(PositionAfterLoading(u"60,-2147483648,300,-400"), (WindowRect{60, 0, 360, 650}));
 
     // A rectangle is not built from missing numbers: the current one stays.
     Settings()->SetApplicationPosition({10, 20, 300, 400});
