@@ -1,5 +1,9 @@
 #include "FuzzEnvironment.h"
 
+#include "libs/toolwell/IItemWindowHub.h"
+#include "platform/IForeignWindows.h"
+#include "platform/IMessageBox.h"
+#include "platform/IProcessLauncher.h"
 #include "platform/Registry.h"
 #include "support/ResetSingletons.h"
 
@@ -69,6 +73,20 @@ void RemoveAppData() {
 void ResetProgram() {
     ResetSingletons();
     Platform::Registry::SetMachineFile(MachineFile());
+}
+
+RecordingPlatform::RecordingPlatform() {
+    Platform::SetProcessLauncher(&m_launcher);
+    Platform::SetMessageBox(&m_messages);
+    Platform::SetForeignWindows(&m_windows);
+    SetItemWindowHub(&m_hub);
+}
+
+RecordingPlatform::~RecordingPlatform() {
+    Platform::SetProcessLauncher(nullptr);
+    Platform::SetMessageBox(nullptr);
+    Platform::SetForeignWindows(nullptr);
+    SetItemWindowHub(nullptr);
 }
 
 QByteArray ReadFile(const QString& path) {

@@ -1,5 +1,10 @@
 #pragma once
 
+#include "support/RecordingForeignWindows.h"
+#include "support/RecordingItemWindowHub.h"
+#include "support/RecordingMessageBox.h"
+#include "support/RecordingProcessLauncher.h"
+
 #include <QByteArray>
 #include <QString>
 
@@ -25,6 +30,22 @@ void ResetProgram();
 QByteArray ReadFile(const QString& path);
 // Writes the file, making its folder; false when it cannot be written.
 bool WriteFile(const QString& path, const QByteArray& bytes);
+
+// While it lives, programs started, message boxes, foreign windows and item windows only go
+// on record: an input never starts a program or waits for an answer.
+class RecordingPlatform {
+public:
+    RecordingPlatform();
+    ~RecordingPlatform();
+    RecordingPlatform(const RecordingPlatform&) = delete;
+    RecordingPlatform& operator=(const RecordingPlatform&) = delete;
+
+private:
+    RecordingProcessLauncher m_launcher;
+    RecordingMessageBox m_messages;
+    RecordingForeignWindows m_windows;
+    RecordingItemWindowHub m_hub;
+};
 
 // A property that must hold for every input: otherwise the input is reported and the run ends
 // as a finding.

@@ -9,13 +9,6 @@
 #include "dataexchange/WProperties.h"
 #include "libs/toolwell/IDataStoreHost.h"
 #include "navigator/WNavDS.h"
-#include "platform/IForeignWindows.h"
-#include "platform/IMessageBox.h"
-#include "platform/IProcessLauncher.h"
-#include "support/RecordingForeignWindows.h"
-#include "support/RecordingItemWindowHub.h"
-#include "support/RecordingMessageBox.h"
-#include "support/RecordingProcessLauncher.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -128,14 +121,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
             catalog, QByteArray(reinterpret_cast<const char*>(data), qsizetype(catalogSize))),
         "catalog written");
 
-    RecordingProcessLauncher launcher;
-    RecordingMessageBox messages;
-    RecordingForeignWindows windows;
-    RecordingItemWindowHub hub;
-    Platform::SetProcessLauncher(&launcher);
-    Platform::SetMessageBox(&messages);
-    Platform::SetForeignWindows(&windows);
-    SetItemWindowHub(&hub);
+    const FuzzEnvironment::RecordingPlatform recording;
 
     int before = -1;
     {

@@ -10,14 +10,7 @@
 #include "libs/toolwell/IDataStoreHost.h"
 #include "messaging/CNavInstanceMgr.h"
 #include "navigator/WNavDS.h"
-#include "platform/IForeignWindows.h"
-#include "platform/IMessageBox.h"
-#include "platform/IProcessLauncher.h"
 #include "platform/Registry.h"
-#include "support/RecordingForeignWindows.h"
-#include "support/RecordingItemWindowHub.h"
-#include "support/RecordingMessageBox.h"
-#include "support/RecordingProcessLauncher.h"
 
 #include <QDirIterator>
 #include <QFileInfo>
@@ -193,14 +186,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     FuzzEnvironment::RemoveAppData();
     WriteNotebook();
 
-    RecordingProcessLauncher launcher;
-    RecordingMessageBox messages;
-    RecordingForeignWindows windows;
-    RecordingItemWindowHub hub;
-    Platform::SetProcessLauncher(&launcher);
-    Platform::SetMessageBox(&messages);
-    Platform::SetForeignWindows(&windows);
-    SetItemWindowHub(&hub);
+    const FuzzEnvironment::RecordingPlatform recording;
     {
         ReleasePtr<IDataStoreHost> host(GetDataStoreHost());
         IDataStoreService* service = CreateDataStoreService(host.get());

@@ -1,7 +1,7 @@
-#include "support/NavigatorProcess.h"
 #include "startpanel/CStartPanelDlg.h"
 #include "startpanel/StartPanelActions.h"
 #include "support/AmbrelTest.h"
+#include "support/NavigatorProcess.h"
 
 #include <QDeadlineTimer>
 #include <QFile>

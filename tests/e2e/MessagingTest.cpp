@@ -1,5 +1,5 @@
-#include "support/NavigatorProcess.h"
 #include "support/AmbrelTest.h"
+#include "support/NavigatorProcess.h"
 
 #include <QDeadlineTimer>
 #include <QFile>

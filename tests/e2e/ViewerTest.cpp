@@ -1,5 +1,5 @@
-#include "support/NavigatorProcess.h"
 #include "support/AmbrelTest.h"
+#include "support/NavigatorProcess.h"
 #include "viewer/SamplePdf.h"
 
 #include <QDBusConnection>
