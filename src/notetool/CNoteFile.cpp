@@ -6,7 +6,6 @@
 
 #include <QFile>
 #include <QFileInfo>
-#include <QSaveFile>
 #include <QStringDecoder>
 
 #include <array>
@@ -206,24 +205,7 @@ bool CNoteFile::Save(const NoteContent& content) {
     m_saveError.clear();
     if (!m_writable)
         return false;
-    QSaveFile file(m_path);
-    if (!file.open(QIODevice::WriteOnly)) {
-        m_saveError = file.errorString();
-        return false;
-    }
-    const QByteArray bytes = Format(content);
-    // A small note stays in the write buffer until the flush; commit would not see that write
-    // fail and would put a cut file in place of the note.
-    if (!Platform::WriteAll(file, bytes.constData(), bytes.size()) || !Platform::FlushAll(file)) {
-        m_saveError = file.errorString();
-        file.cancelWriting();
-        return false;
-    }
-    if (!file.commit()) {
-        m_saveError = file.errorString();
-        return false;
-    }
-    return true;
+    return Platform::ReplaceFile(m_path, Format(content), &m_saveError);
 }
 
 QByteArray CNoteFile::Format(const NoteContent& content) {

@@ -2,7 +2,9 @@
 
 #include <QtGlobal>
 
+class QByteArray;
 class QFileDevice;
+class QString;
 
 namespace Platform {
 
@@ -14,5 +16,8 @@ namespace Platform {
 bool WriteAll(QFileDevice& file, const char* data, qint64 size);
 // Writes out what the file still buffers: commit and close would not see that write fail.
 bool FlushAll(QFileDevice& file);
+// Puts bytes in the place of the file at path, whole or not at all (written aside and renamed
+// over it); false with the system's reason in error.
+bool ReplaceFile(const QString& path, const QByteArray& bytes, QString* error);
 
 } // namespace Platform

@@ -18,7 +18,6 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
-#include <QSaveFile>
 #include <QtEndian>
 
 #include <algorithm>
@@ -222,21 +221,7 @@ bool NavigatorSettings::Save() {
 
     QByteArray bytes(text.size() * 2, Qt::Uninitialized);
     qToLittleEndian<char16_t>(text.utf16(), text.size(), bytes.data());
-    QSaveFile file(folder + QStringLiteral("/NavSettings.dat"));
-    if (!file.open(QIODevice::WriteOnly)) {
-        m_saveError = file.errorString();
-        return false;
-    }
-    if (!Platform::WriteAll(file, bytes.constData(), bytes.size()) || !Platform::FlushAll(file)) {
-        m_saveError = file.errorString();
-        file.cancelWriting();
-        return false;
-    }
-    if (!file.commit()) {
-        m_saveError = file.errorString();
-        return false;
-    }
-    return true;
+    return Platform::ReplaceFile(folder + QStringLiteral("/NavSettings.dat"), bytes, &m_saveError);
 }
 
 bool NavigatorSettings::SaveIfDirty() {
