@@ -12,6 +12,7 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QTemporaryDir>
 
 #include <cstdio>
 #include <cstdlib>
@@ -32,12 +33,13 @@ QString MachineFile() {
 } // namespace
 
 void SetUp(int* argc, char*** argv, Application application) {
-    char pattern[] = "/tmp/ambrel-fuzz-XXXXXX";
-    if (::mkdtemp(pattern) == nullptr) {
-        std::perror("mkdtemp");
+    // Removed when the run ends: libFuzzer ends a run with exit().
+    static QTemporaryDir home(QDir::tempPath() + QStringLiteral("/ambrel-fuzz-XXXXXX"));
+    if (!home.isValid()) {
+        std::fprintf(stderr, "no temporary folder: %s\n", qPrintable(home.errorString()));
         std::abort();
     }
-    g_home = QString::fromLocal8Bit(pattern);
+    g_home = home.path();
     const QString data = g_home + QStringLiteral("/data");
     const QString config = g_home + QStringLiteral("/config");
     const QString runtime = g_home + QStringLiteral("/runtime");

@@ -54,10 +54,13 @@ for target in "${selected[@]}"; do
   [ -n "${AMBREL_FUZZ_SEED:-}" ] && options+=(-seed="$AMBREL_FUZZ_SEED")
   log=build-fuzz/fuzz-$target.log
   started=$(date +%s)
+  # The target's temporary home goes with the run, even when it ends in a finding.
+  scratch=$(mktemp -d)
   set +e
-  "build-fuzz/fuzz/fuzz_$target" "${options[@]}" "$corpus" >"$log" 2>&1
+  TMPDIR=$scratch "build-fuzz/fuzz/fuzz_$target" "${options[@]}" "$corpus" >"$log" 2>&1
   result=$?
   set -e
+  rm -rf "$scratch"
   elapsed=$(($(date +%s) - started))
   executions=$(sed -n 's/^stat::number_of_executed_units: *//p' "$log" | tail -n 1)
   artifact=$(sed -n 's/.*Test unit written to \(.*\)$/\1/p' "$log" | tail -n 1)
